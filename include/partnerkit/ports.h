@@ -1,0 +1,120 @@
+// What the library asks of the platform: files, clock, computer name, and the error trail's outlets. An embedding
+// program takes `platform::DefaultPorts()` and replaces what it wants to handle itself.
+#pragma once
+
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <span>
+#include <string>
+#include <string_view>
+
+#include "partnerkit/run_time_error.h"
+#include "partnerkit/values.h"
+
+namespace partnerkit {
+
+// A file held open for reading. Every operation may raise RunTimeError.
+class InputFile {
+ public:
+  virtual ~InputFile() = default;
+  // Reads up to `into.size()` bytes at byte `offset` (from 0); the number read, 0 at the end of the file.
+  virtual std::size_t ReadAt(std::uint64_t offset, std::span<char> into) = 0;
+  virtual std::uint64_t Length() = 0;
+  // False when the path now names another file than the one held (somebody replaced it).
+  virtual bool StillNamed(const std::string& path) = 0;
+  // A text without blanks or line ends that tells this file from any other that bears its name before or after it: the
+  // same while the file grows, another once it is replaced.
+  virtual std::string Identity() = 0;
+};
+
+// A file held open for writing. Every operation may raise RunTimeError. A file that is let go without `Close` keeps
+// what was written so far.
+class OutputFile {
+ public:
+  virtual ~OutputFile() = default;
+  virtual void Write(std::string_view bytes) = 0;
+  // Everything written so far is on the disk when this returns.
+  virtual void Sync() = 0;
+  virtual std::uint64_t Length() = 0;
+  // Cuts the file back to `length` bytes.
+  virtual void Truncate(std::uint64_t length) = 0;
+  virtual void Close() = 0;
+};
+
+enum class Share {
+  kExclusive,  // no other program may hold the file
+  kDenyWrite,  // others may read it, not write it
+};
+
+enum class OutputMode {
+  kReplace,  // a new file, or an old one emptied
+  kAppend,   // a new file, or behind what the old one holds
+};
+
+// The file system. A "\" in a path counts as the platform's separator where no file of that very name exists. Failures
+// raise RunTimeError with the numbers of `run_time`.
+class Files {
+ public:
+  virtual ~Files() = default;
+  virtual std::uint64_t Length(const std::string& path) = 0;
+  virtual bool Exists(const std::string& path) = 0;
+  virtual std::unique_ptr<InputFile> OpenInput(const std::string& path, Share share) = 0;
+  // Exclusive: an output file is never shared.
+  virtual std::unique_ptr<OutputFile> OpenOutput(const std::string& path, OutputMode mode) = 0;
+  virtual void Delete(const std::string& path) = 0;
+  // Gives `from` the name `to` in one step, in the place of a file that has it; durable when it returns.
+  virtual void Rename(const std::string& from, const std::string& to) = 0;
+};
+
+class Clock {
+ public:
+  virtual ~Clock() = default;
+  virtual DateTime Now() = 0;
+};
+
+// A run-time error as the error trail tells it.
+struct ErrorReport {
+  std::int32_t number;
+  std::string description;
+  std::string module;
+  std::string procedure;
+  std::string report;  // the whole sentence
+};
+
+enum class Button { kAbort, kRetry, kIgnore };
+
+struct Mail {
+  std::string recipient, subject, note, type, attachmentPath, attachmentName;
+};
+
+// Where the error trail goes. Every outlet may be left empty: without a dialog the answer is Abort.
+struct ErrorOutlets {
+  std::function<Button(const ErrorReport& report, const std::string& title)> dialog;
+  std::function<void(std::uint64_t window, const std::string& text)> monitor;
+  std::function<void(const Mail& mail)> mail;
+  std::string applicationName;
+  std::string libraryPath;
+};
+
+// Optional outputs of the error trail. All are off at first, so that only the dialog acts.
+struct ErrorSettings {
+  std::uint64_t monitorWindow = 0;  // above 0: each error goes to this window as text
+  bool logToFile = false;           // append each report to the log file
+  std::string logFileName;          // empty: "error.log" in the current folder
+  std::string mailRecipient;        // not empty: mail each report
+  bool silent = false;              // never ask; the procedure is left
+  bool passUpward = false;          // raise the error again for the calling component
+};
+
+// Everything a class is handed at its creation. The objects must outlive the class.
+struct Ports {
+  Files* files = nullptr;
+  Clock* clock = nullptr;
+  // The computer's name; nothing when the platform cannot tell.
+  std::function<std::optional<std::string>()> computerName;
+  ErrorOutlets errorOutlets;
+  ErrorSettings errorSettings;
+};
+
+}  // namespace partnerkit

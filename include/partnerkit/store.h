@@ -1,0 +1,113 @@
+// What the library asks of the host: the record store and the one `System` object of a run. An embedding program
+// derives from these; the bundled host keeps its records in SQL.
+#pragma once
+
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "partnerkit/record_type.h"
+
+namespace partnerkit {
+
+// Records by type. `record` and `probe` always point to a struct of the type named.
+//
+// `Load`, `Find` and `Select` raise RunTimeError (run_time::kDatabase) when the store itself fails, so that a broken
+// store is never taken for a missing record. `Add`, `Update` and `Delete` give False instead, with the cause in
+// `NativeError`.
+class RecordStore {
+ public:
+  virtual ~RecordStore() = default;
+
+  // Reads the record whose key (or, for a record without a key, whose id) is set. False when there is none; the record
+  // is then unchanged.
+  virtual bool Load(const RecordType& type, void* record) = 0;
+  // Stores a new record; one with an id gets it set. What was stored before a False stays as it is.
+  virtual bool Add(const RecordType& type, void* record) = 0;
+  // Writes every member back, by id when the type has one, else by key. False when there is no such record.
+  virtual bool Update(const RecordType& type, const void* record) = 0;
+  // Removes the record, by id when the type has one, else by key. False when there is no such record.
+  virtual bool Delete(const RecordType& type, const void* record) = 0;
+  // Finds one record by the members of a look-up, whose values `record` carries, and reads it; the oldest, if several
+  // fit.
+  virtual bool Find(const RecordType& type, const Lookup& lookup, void* record) = 0;
+  // Gives every record that fits `probe` in the members of the look-up, in the order added. For each, `next` is asked
+  // for a place to read it into; null ends the walk.
+  virtual void Select(const RecordType& type, const Lookup& lookup, const void* probe,
+                      const std::function<void*()>& next) = 0;
+  // How many records fit.
+  virtual std::int32_t Count(const RecordType& type, const Lookup& lookup, const void* probe) = 0;
+  // The database's own number for its newest failure; 0 when nothing failed since the last success.
+  virtual std::int32_t NativeError() const = 0;
+};
+
+// The same, typed. R::kType is the record's type.
+template <class R>
+bool Load(RecordStore& store, R& record) {
+  return store.Load(R::kType, &record);
+}
+template <class R>
+bool Add(RecordStore& store, R& record) {
+  return store.Add(R::kType, &record);
+}
+template <class R>
+bool Update(RecordStore& store, const R& record) {
+  return store.Update(R::kType, &record);
+}
+template <class R>
+bool Delete(RecordStore& store, const R& record) {
+  return store.Delete(R::kType, &record);
+}
+template <class R>
+bool Find(RecordStore& store, const Lookup& lookup, R& record) {
+  return store.Find(R::kType, lookup, &record);
+}
+template <class R>
+std::int32_t Count(RecordStore& store, const Lookup& lookup, const R& probe) {
+  return store.Count(R::kType, lookup, &probe);
+}
+template <class R>
+std::vector<std::shared_ptr<R>> Select(RecordStore& store, const Lookup& lookup, const R& probe) {
+  std::vector<std::shared_ptr<R>> found;
+  store.Select(R::kType, lookup, &probe,
+               [&found]() -> void* { return found.emplace_back(std::make_shared<R>()).get(); });
+  // The place handed out last may have stayed unread; a store asks only when it has a record to give.
+  return found;
+}
+
+struct EDIDoc;
+struct Order;
+
+// Which of a partner's counters.
+enum class Counter { kASNNo, kInterchangeNo, kGroupNo };
+
+// The one host object of a run.
+class System {
+ public:
+  virtual ~System() = default;
+
+  virtual RecordStore& Records() = 0;
+  // Who is signed on.
+  virtual std::string UserId() = 0;
+  // Removes a stored order with its lines, locations and location lines. False when the host or the store refuses, and
+  // the order then stays whole.
+  virtual bool DeleteOrder(const Order& order) = 0;
+  // Makes all that was stored since the last one durable. The argument is the host's; the library passes 0.
+  virtual void Commit(std::int32_t mode) = 0;
+  // A transaction around one posting. What was stored before it is made durable first.
+  virtual void BeginTrans() = 0;
+  virtual void CommitTrans() = 0;
+  virtual void RollbackTrans() = 0;
+  // All document definitions, by `EDIDocId`.
+  virtual std::vector<EDIDoc> EDIDocList() = 0;
+  // Moves a counter of the partner on by one and gives the new number, durable at once: no number is given twice,
+  // whatever crashes and however many programs share the store. Raises RunTimeError when the partner is unknown or the
+  // store fails, and within BeginTrans, where a number could be taken back.
+  virtual std::int32_t NextNumber(std::string_view partnerId, Counter counter) = 0;
+};
+
+}  // namespace partnerkit

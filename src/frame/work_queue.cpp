@@ -1,0 +1,68 @@
+#include "frame/work_queue.h"
+
+namespace partnerkit {
+
+std::string TemporaryName(std::string_view path) {
+  const std::size_t folder = path.find_last_of("/\\");
+  const std::size_t name = folder == std::string_view::npos ? 0 : folder + 1;
+  const std::size_t dot = path.substr(name).rfind('.');
+  const std::string temporary = std::string(dot == std::string_view::npos ? path : path.substr(0, name + dot)) + ".tmp";
+  return temporary == path ? temporary + ".tmp" : temporary;
+}
+
+void WorkQueue::Open(const std::string& path) {
+  path_ = path;
+  lines_.reset();
+  file_ = files_.OpenInput(path, Share::kExclusive);
+  lines_.emplace(*file_);
+}
+
+void WorkQueue::Close() {
+  lines_.reset();
+  file_.reset();
+}
+
+LineReader& WorkQueue::Lines() {
+  File();
+  return *lines_;
+}
+
+InputFile& WorkQueue::File() {
+  if (!file_) throw RunTimeError(run_time::kBadFileName, "The order file is not open");
+  return *file_;
+}
+
+WorkQueue::Rewrite::Rewrite(WorkQueue& queue) : queue_(queue), temporary_(TemporaryName(queue.path_)) {}
+
+WorkQueue::Rewrite::~Rewrite() {
+  if (!out_) return;
+  out_.reset();
+  try {
+    queue_.files_.Delete(temporary_);
+  } catch (const RunTimeError&) {
+    // It stays beside the order file, as it does when the order file cannot be replaced; the next rewrite clears it.
+  }
+}
+
+void WorkQueue::Rewrite::Begin() {
+  try {
+    queue_.files_.Delete(temporary_);
+  } catch (const RunTimeError&) {
+    // There is none, as a rule.
+  }
+  out_ = queue_.files_.OpenOutput(temporary_, OutputMode::kReplace);
+}
+
+void WorkQueue::Rewrite::Claim() {
+  const std::unique_ptr<OutputFile> out = std::move(out_);
+  if (out) out->Close();
+  if (!queue_.File().StillNamed(queue_.path_)) {
+    throw RunTimeError(
+        run_time::kFileNotFound,
+        "The file " + queue_.path_ + " was taken away or replaced; what is left of it is in " + temporary_);
+  }
+}
+
+void WorkQueue::Rewrite::Replace() { queue_.files_.Rename(temporary_, queue_.path_); }
+
+}  // namespace partnerkit

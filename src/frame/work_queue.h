@@ -1,0 +1,107 @@
+// An inbound file as a work queue: held exclusively while its rows are worked on, rewritten in one step so that what is
+// done leaves it and everything else stays, byte for byte.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "frame/line_reader.h"
+#include "partnerkit/ports.h"
+
+namespace partnerkit {
+
+// The name with the part behind its last "." replaced by "tmp"; ".tmp" at the end of a name without one, or of a name
+// that would stay as it is. A "." of a folder's name doesn't count.
+std::string TemporaryName(std::string_view path);
+
+// Bytes of a file: from `begin` up to, not including, `end`, positions from 1.
+struct ByteRange {
+  std::uint64_t begin;
+  std::uint64_t end;
+};
+
+// The supplier's copy of every posted order's lines, over all runs. Held exclusively while open.
+//
+// A program that dies while it appends must leave neither half a line nor a line twice. So what is about to be appended
+// is first noted in a small file beside the backup (its name and ".pending"): the backup's length, the order file and
+// the byte ranges. `Open` finishes what such a note tells of; the order file is replaced only once the backup is whole,
+// so that it still holds the lines.
+class BackupFile {
+ public:
+  explicit BackupFile(Files& files) : files_(files) {}
+
+  // Raises RunTimeError when it cannot be opened, held or finished.
+  void Open(const std::string& path);
+  bool IsOpen() const { return file_ != nullptr; }
+  void Close();
+  // Appends the ranges of `source`, each line whole, and leaves the note until `Settle`. On a failure the backup is cut
+  // back and the note kept, for the next `Open` to finish.
+  void Append(InputFile& source, const std::string& sourcePath, const std::vector<ByteRange>& ranges);
+  // The order file no longer holds the lines appended, or the program knows them as done: the note goes.
+  void Settle();
+
+ private:
+  std::string NotePath() const { return path_ + ".pending"; }
+  struct Note;
+  static std::optional<Note> ReadNote(InputFile& file);
+  void WriteNote(InputFile& source, const std::string& sourcePath, const std::vector<ByteRange>& ranges);
+  void FinishPending();
+  void Finish(const Note& note);
+  void CopyRanges(InputFile& source, const std::vector<ByteRange>& ranges);
+
+  Files& files_;
+  std::string path_;
+  std::unique_ptr<OutputFile> file_;
+  bool pending_ = false;
+};
+
+// The inbound file.
+class WorkQueue {
+ public:
+  explicit WorkQueue(Files& files) : files_(files) {}
+
+  // Takes the exclusive hold. Raises RunTimeError.
+  void Open(const std::string& path);
+  bool IsOpen() const { return file_ != nullptr; }
+  void Close();
+  const std::string& Path() const { return path_; }
+  // Raises RunTimeError when the file isn't open.
+  LineReader& Lines();
+  InputFile& File();
+
+  // A rewrite, in this order: `Begin` makes the temporary file, `Keep` takes each line that stays, `Finish` brings it
+  // to the disk, `Claim` and `Replace` put it in the order file's place. All raise RunTimeError. An object that goes
+  // before `Claim` takes the temporary file with it; from then on that stays, beside an order file that keeps all its
+  // lines.
+  class Rewrite {
+   public:
+    explicit Rewrite(WorkQueue& queue);
+    ~Rewrite();
+    Rewrite(const Rewrite&) = delete;
+    Rewrite& operator=(const Rewrite&) = delete;
+
+    void Begin();
+    void Keep(const Line& line) { out_->Write(line.raw); }
+    void Finish() { out_->Sync(); }
+    // Fails when the order file is no longer the one held.
+    void Claim();
+    void Replace();
+
+   private:
+    WorkQueue& queue_;
+    std::string temporary_;
+    std::unique_ptr<OutputFile> out_;
+  };
+
+ private:
+  Files& files_;
+  std::string path_;
+  std::unique_ptr<InputFile> file_;
+  std::optional<LineReader> lines_;
+};
+
+}  // namespace partnerkit
