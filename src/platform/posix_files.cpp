@@ -1,0 +1,439 @@
+#include "platform/posix_files.h"
+
+#include <fcntl.h>
+#include <sys/file.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+#include <limits>
+#include <optional>
+#include <string_view>
+#include <utility>
+
+namespace partnerkit::platform {
+
+namespace {
+
+static_assert(sizeof(off_t) == 8, "files above 2 GiB need 64-bit offsets");
+
+// Enough for the disk to run at its speed, little enough to hold one for each open file.
+constexpr std::size_t kWriteBuffer = 256 * 1024;
+
+// How often a file that is replaced while it is being opened is tried again.
+constexpr int kOpenAttempts = 5;
+
+// clang-format off
+constexpr std::pair<std::int32_t, std::string_view> kWordings[] = {
+    {run_time::kOutOfMemory,      "Out of memory"},
+    {run_time::kBadFileName,      "Bad file name or number"},
+    {run_time::kFileNotFound,     "File not found"},
+    {run_time::kDeviceError,      "Device I/O error"},
+    {run_time::kDiskFull,         "Disk full"},
+    {run_time::kTooManyFiles,     "Too many files"},
+    {run_time::kPermissionDenied, "Permission denied"},
+    {run_time::kPathAccess,       "Path/File access error"},
+    {run_time::kPathNotFound,     "Path not found"},
+};
+
+constexpr std::pair<int, std::int32_t> kNumbers[] = {
+    {ENOENT,       run_time::kFileNotFound},
+    {ENOTDIR,      run_time::kPathNotFound},
+    {ENAMETOOLONG, run_time::kBadFileName},
+    {EACCES,       run_time::kPathAccess},
+    {EPERM,        run_time::kPathAccess},
+    {EROFS,        run_time::kPathAccess},
+    {EISDIR,       run_time::kPathAccess},
+    {EBUSY,        run_time::kPermissionDenied},
+    {ETXTBSY,      run_time::kPermissionDenied},
+    {EWOULDBLOCK,  run_time::kPermissionDenied},
+    {ENOSPC,       run_time::kDiskFull},
+    {EDQUOT,       run_time::kDiskFull},
+    {EFBIG,        run_time::kDiskFull},
+    {EMFILE,       run_time::kTooManyFiles},
+    {ENFILE,       run_time::kTooManyFiles},
+    {ENOMEM,       run_time::kOutOfMemory},
+    {EIO,          run_time::kDeviceError},
+    {ENXIO,        run_time::kDeviceError},
+    {ENODEV,       run_time::kDeviceError},
+};
+// clang-format on
+
+// The row of a table of pairs, or `otherwise` where there is none.
+template <class Table, class Value>
+Value LookUp(const Table& table, int key, Value otherwise) {
+  for (const auto& [known, value] : table) {
+    if (known == key) return value;
+  }
+  return otherwise;
+}
+
+[[noreturn]] void Raise(std::int32_t number, std::string path, std::string_view cause) {
+  // The description goes into one-line logs.
+  std::ranges::replace_if(
+      path, [](unsigned char c) { return c < ' ' || c == 0x7F; }, '?');
+  throw RunTimeError(
+      number, std::string(LookUp(kWordings, number, std::string_view())) + ": " + path + ": " + std::string(cause));
+}
+
+std::string Folder(const std::string& native) {
+  const std::size_t slash = native.find_last_of('/');
+  if (slash == std::string::npos) return ".";
+  return slash == 0 ? "/" : native.substr(0, slash);
+}
+
+bool FolderMissing(const std::string& native) {
+  struct stat folder {};
+  return stat(Folder(native).c_str(), &folder) != 0 && (errno == ENOENT || errno == ENOTDIR);
+}
+
+// `otherwise` is the number of a cause that has none of its own.
+[[noreturn]] void RaiseCause(int cause, const std::string& native, std::int32_t otherwise) {
+  // Never in the language of the process locale, unlike strerror.
+  const char* words = strerrordesc_np(cause);
+  const std::int32_t number =
+      cause == ENOENT && FolderMissing(native) ? run_time::kPathNotFound : LookUp(kNumbers, cause, otherwise);
+  Raise(number, native, words == nullptr ? "unknown cause" : words);
+}
+
+template <class F>
+auto Uninterrupted(F call) {
+  for (;;) {
+    const auto result = call();
+    if (result != -1 || errno != EINTR) return result;
+  }
+}
+
+// The native form of a path that a call of the system may be given.
+std::string Checked(const std::string& path) {
+  if (path.find('\0') != std::string::npos) Raise(run_time::kBadFileName, path, "A name cannot hold a NUL byte");
+  return NativePath(path);
+}
+
+class Descriptor {
+ public:
+  Descriptor() = default;
+  explicit Descriptor(int number) : number_(number) {}
+  Descriptor(Descriptor&& other) noexcept : number_(std::exchange(other.number_, -1)) {}
+  Descriptor& operator=(Descriptor&& other) noexcept {
+    std::swap(number_, other.number_);
+    return *this;
+  }
+  ~Descriptor() {
+    if (number_ != -1) ::close(number_);
+  }
+
+  int Number() const { return number_; }
+  bool IsOpen() const { return number_ != -1; }
+  // The descriptor is gone whatever the answer, an interrupted call included: another file may have its number by now.
+  int Close() { return ::close(std::exchange(number_, -1)) == 0 || errno == EINTR ? 0 : errno; }
+
+ private:
+  int number_ = -1;
+};
+
+struct stat StatusOf(int descriptor, const std::string& native) {
+  struct stat status {};
+  if (fstat(descriptor, &status) != 0) RaiseCause(errno, native, run_time::kDeviceError);
+  return status;
+}
+
+bool Names(const std::string& native, const struct stat& held) {
+  struct stat named {};
+  if (stat(native.c_str(), &named) == 0) return named.st_dev == held.st_dev && named.st_ino == held.st_ino;
+  if (errno == ENOENT || errno == ENOTDIR) return false;
+  RaiseCause(errno, native, run_time::kPathAccess);
+}
+
+bool LocksUnknown(int cause) { return cause == ENOLCK || cause == ENOSYS || cause == EOPNOTSUPP || cause == EINVAL; }
+
+// Takes both kinds of lock. A file system may know one kind only, which then has to do.
+void Hold(int descriptor, bool exclusive, bool writable, const std::string& native) {
+  int failures = 0;
+  const auto judge = [&](int result) {
+    if (result == 0) return;
+    if (errno == EWOULDBLOCK || errno == EACCES) {
+      Raise(run_time::kPermissionDenied, native, "The file is in use");
+    }
+    if (!LocksUnknown(errno) || ++failures == 2) RaiseCause(errno, native, run_time::kPathAccess);
+  };
+  judge(Uninterrupted([&] { return flock(descriptor, (exclusive ? LOCK_EX : LOCK_SH) | LOCK_NB); }));
+  struct flock wholeFile {};
+  // A write lock is refused on a descriptor that cannot write; a read lock then still turns writers away.
+  wholeFile.l_type = exclusive && writable ? F_WRLCK : F_RDLCK;
+  wholeFile.l_whence = SEEK_SET;
+  judge(Uninterrupted([&] { return fcntl(descriptor, F_OFD_SETLK, &wholeFile); }));
+}
+
+struct Opened {
+  Descriptor descriptor;
+  bool writable;
+};
+
+// Gives what `open` opens, held, once the name still means that file. A file that was replaced between the two would be
+// held by nobody who looks for it.
+template <class F>
+std::pair<Descriptor, struct stat> OpenHeld(const std::string& native, bool exclusive, F open) {
+  for (int attempt = 0; attempt < kOpenAttempts; ++attempt) {
+    Opened opened = open();
+    const struct stat status = StatusOf(opened.descriptor.Number(), native);
+    if (S_ISDIR(status.st_mode)) RaiseCause(EISDIR, native, run_time::kPathAccess);
+    Hold(opened.descriptor.Number(), exclusive, opened.writable, native);
+    if (Names(native, status)) return {std::move(opened.descriptor), status};
+  }
+  Raise(run_time::kPermissionDenied, native, "Another program keeps replacing the file");
+}
+
+// Without O_NONBLOCK the opening of a pipe would wait for its other end. Regular files don't heed it.
+constexpr int kOpenFlags = O_CLOEXEC | O_NOCTTY | O_NONBLOCK;
+
+Opened OpenToRead(const std::string& native, bool preferWritable) {
+  const auto open = [&](int access) {
+    return Descriptor(Uninterrupted([&] { return ::open(native.c_str(), access | kOpenFlags); }));
+  };
+  if (preferWritable) {
+    Descriptor writable = open(O_RDWR);
+    if (writable.IsOpen()) return {std::move(writable), true};
+    if (errno != EACCES && errno != EPERM && errno != EROFS && errno != ETXTBSY) {
+      RaiseCause(errno, native, run_time::kPathAccess);
+    }
+  }
+  Descriptor readable = open(O_RDONLY);
+  if (!readable.IsOpen()) RaiseCause(errno, native, run_time::kPathAccess);
+  return {std::move(readable), false};
+}
+
+Opened OpenToWrite(const std::string& native) {
+  // No O_TRUNC: another program's file must not be emptied before it is known to be free.
+  Descriptor opened(
+      Uninterrupted([&] { return ::open(native.c_str(), O_WRONLY | O_CREAT | O_APPEND | kOpenFlags, 0666); }));
+  if (!opened.IsOpen()) RaiseCause(errno, native, run_time::kPathAccess);
+  return {std::move(opened), true};
+}
+
+// A folder open for making its names durable. One that may be written but not read cannot be opened.
+class FolderOf {
+ public:
+  explicit FolderOf(const std::string& native)
+      : path_(Folder(native)),
+        opened_(Uninterrupted([&] { return ::open(path_.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC); })) {
+    if (!opened_.IsOpen() && (errno == EMFILE || errno == ENFILE)) RaiseCause(errno, path_, run_time::kTooManyFiles);
+  }
+
+  const std::string& Path() const { return path_; }
+  void Sync() const {
+    if (!opened_.IsOpen()) {
+      ::sync();
+    } else if (Uninterrupted([&] { return fsync(opened_.Number()); }) != 0 && errno != EINVAL) {
+      RaiseCause(errno, path_, run_time::kDeviceError);
+    }
+  }
+
+ private:
+  std::string path_;
+  Descriptor opened_;
+};
+
+class PosixInput : public InputFile {
+ public:
+  PosixInput(Descriptor descriptor, std::string native)
+      : descriptor_(std::move(descriptor)), native_(std::move(native)) {}
+
+  std::size_t ReadAt(std::uint64_t offset, std::span<char> into) override {
+    if (offset > static_cast<std::uint64_t>(std::numeric_limits<off_t>::max())) return 0;
+    const ssize_t count = Uninterrupted(
+        [&] { return pread(descriptor_.Number(), into.data(), into.size(), static_cast<off_t>(offset)); });
+    if (count < 0) RaiseCause(errno, native_, run_time::kDeviceError);
+    return static_cast<std::size_t>(count);
+  }
+
+  std::uint64_t Length() override {
+    return static_cast<std::uint64_t>(StatusOf(descriptor_.Number(), native_).st_size);
+  }
+
+  bool StillNamed(const std::string& path) override {
+    return Names(Checked(path), StatusOf(descriptor_.Number(), native_));
+  }
+
+  // The file's number alone would not do: it goes to the next file made once this one is deleted. The device's number
+  // may change with a restart. Where the file system keeps no time of birth, the file's number has to do.
+  std::string Identity() override {
+    struct statx status {};
+    if (statx(descriptor_.Number(), "", AT_EMPTY_PATH, STATX_INO | STATX_BTIME, &status) != 0) {
+      RaiseCause(errno, native_, run_time::kDeviceError);
+    }
+    return std::to_string(status.stx_ino) + "-" + std::to_string(status.stx_btime.tv_sec) + "-" +
+           std::to_string(status.stx_btime.tv_nsec);
+  }
+
+ private:
+  Descriptor descriptor_;
+  std::string native_;
+};
+
+class PosixOutput : public OutputFile {
+ public:
+  PosixOutput(Descriptor descriptor, std::string native, std::uint64_t length)
+      : descriptor_(std::move(descriptor)), native_(std::move(native)), written_(length), nameUnsynced_(length == 0) {}
+
+  ~PosixOutput() override {
+    try {
+      if (descriptor_.IsOpen()) Flush();
+    } catch (...) {
+      // Let go without Close: nobody is there to be told.
+    }
+  }
+
+  // Takes all of `bytes` or, when it raises, none, so that a repeated call writes them once.
+  void Write(std::string_view bytes) override {
+    CheckOpen();
+    if (buffer_.size() + bytes.size() > kWriteBuffer) Flush();
+    if (buffer_.capacity() < kWriteBuffer) buffer_.reserve(kWriteBuffer);
+    buffer_.append(bytes);
+  }
+
+  void Sync() override {
+    CheckOpen();
+    Flush();
+    // After a failure the system forgets the bytes it could not write, and a second call would falsely succeed.
+    if (syncFailure_ == 0 && Uninterrupted([&] { return fdatasync(descriptor_.Number()); }) != 0 && errno != EINVAL) {
+      syncFailure_ = errno;
+    }
+    if (syncFailure_ != 0) RaiseCause(syncFailure_, native_, run_time::kDeviceError);
+    if (nameUnsynced_) FolderOf(native_).Sync();
+    nameUnsynced_ = false;
+  }
+
+  std::uint64_t Length() override { return written_ + buffer_.size(); }
+
+  void Truncate(std::uint64_t length) override {
+    CheckOpen();
+    if (length >= Length()) return;
+    if (length < written_) {
+      if (Uninterrupted([&] { return ftruncate(descriptor_.Number(), static_cast<off_t>(length)); }) != 0) {
+        RaiseCause(errno, native_, run_time::kDeviceError);
+      }
+      written_ = length;
+    }
+    buffer_.resize(length - written_);
+  }
+
+  void Close() override {
+    CheckOpen();
+    Flush();
+    const int failure = descriptor_.Close();
+    if (failure != 0) RaiseCause(failure, native_, run_time::kDeviceError);
+  }
+
+ private:
+  void CheckOpen() const {
+    if (!descriptor_.IsOpen()) Raise(run_time::kBadFileName, native_, "The file is closed");
+  }
+
+  // What could not be written stays in the buffer.
+  void Flush() {
+    std::size_t done = 0;
+    int failure = 0;
+    while (done < buffer_.size() && failure == 0) {
+      const ssize_t count =
+          Uninterrupted([&] { return ::write(descriptor_.Number(), buffer_.data() + done, buffer_.size() - done); });
+      if (count > 0) done += static_cast<std::size_t>(count);
+      else failure = count == 0 ? EIO : errno;
+    }
+    written_ += done;
+    buffer_.erase(0, done);
+    if (failure != 0) RaiseCause(failure, native_, run_time::kDeviceError);
+  }
+
+  Descriptor descriptor_;
+  std::string native_;
+  std::string buffer_;
+  std::uint64_t written_;
+  bool nameUnsynced_;
+  int syncFailure_ = 0;
+};
+
+}  // namespace
+
+std::string NativePath(const std::string& path) {
+  if (path.find('\\') == std::string::npos) return path;
+  std::string native;
+  for (std::size_t begin = 0; begin < path.size();) {
+    const std::size_t end = std::min(path.find('/', begin), path.size());
+    std::string name = path.substr(begin, end - begin);
+    struct stat status {};
+    if (name.find('\\') != std::string::npos && lstat((native + name).c_str(), &status) != 0) {
+      std::ranges::replace(name, '\\', '/');
+    }
+    native += name;
+    if (end < path.size()) native += '/';
+    begin = end + 1;
+  }
+  return native;
+}
+
+std::uint64_t PosixFiles::Length(const std::string& path) {
+  const std::string native = Checked(path);
+  struct stat status {};
+  if (stat(native.c_str(), &status) != 0) RaiseCause(errno, native, run_time::kPathAccess);
+  if (S_ISDIR(status.st_mode)) RaiseCause(EISDIR, native, run_time::kPathAccess);
+  return static_cast<std::uint64_t>(status.st_size);
+}
+
+bool PosixFiles::Exists(const std::string& path) {
+  if (path.find('\0') != std::string::npos) return false;
+  struct stat status {};
+  return stat(NativePath(path).c_str(), &status) == 0 && !S_ISDIR(status.st_mode);
+}
+
+std::unique_ptr<InputFile> PosixFiles::OpenInput(const std::string& path, Share share) {
+  std::string native = Checked(path);
+  const bool exclusive = share == Share::kExclusive;
+  auto [descriptor, status] = OpenHeld(native, exclusive, [&] { return OpenToRead(native, exclusive); });
+  if (!S_ISREG(status.st_mode)) Raise(run_time::kPathAccess, native, "Not a file whose bytes can be addressed");
+  // A hint only: a file system that ignores it reads as well.
+  static_cast<void>(posix_fadvise(descriptor.Number(), 0, 0, POSIX_FADV_SEQUENTIAL));
+  return std::make_unique<PosixInput>(std::move(descriptor), std::move(native));
+}
+
+std::unique_ptr<OutputFile> PosixFiles::OpenOutput(const std::string& path, OutputMode mode) {
+  std::string native = Checked(path);
+  auto [descriptor, status] = OpenHeld(native, true, [&] { return OpenToWrite(native); });
+  const int number = descriptor.Number();
+  std::uint64_t length = 0;
+  if (!S_ISREG(status.st_mode)) {
+    // A device takes bytes at its own speed.
+    fcntl(number, F_SETFL, O_APPEND);
+  } else if (mode == OutputMode::kAppend) {
+    // Measured under the hold: the file may have grown since it was opened.
+    length = static_cast<std::uint64_t>(StatusOf(number, native).st_size);
+  } else if (Uninterrupted([number] { return ftruncate(number, 0); }) != 0) {
+    RaiseCause(errno, native, run_time::kPathAccess);
+  }
+  return std::make_unique<PosixOutput>(std::move(descriptor), std::move(native), length);
+}
+
+void PosixFiles::Delete(const std::string& path) {
+  const std::string native = Checked(path);
+  if (::unlink(native.c_str()) != 0) RaiseCause(errno, native, run_time::kPathAccess);
+}
+
+void PosixFiles::Rename(const std::string& from, const std::string& to) {
+  const std::string nativeFrom = Checked(from);
+  const std::string nativeTo = Checked(to);
+  // Opened first: an error that came after the renaming could not be answered by doing it again.
+  const FolderOf oldFolder(nativeFrom);
+  const FolderOf newFolder(nativeTo);
+  if (std::rename(nativeFrom.c_str(), nativeTo.c_str()) != 0) {
+    const int cause = errno;
+    const bool targetFailed = cause == EISDIR || (cause == ENOENT && FolderMissing(nativeTo));
+    RaiseCause(cause, targetFailed ? nativeTo : nativeFrom, run_time::kPathAccess);
+  }
+  newFolder.Sync();
+  if (oldFolder.Path() != newFolder.Path()) oldFolder.Sync();
+}
+
+}  // namespace partnerkit::platform
