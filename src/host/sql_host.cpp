@@ -1,0 +1,190 @@
+#include "host/sql_host.h"
+
+#include <pwd.h>
+#include <unistd.h>
+
+#include <array>
+#include <limits>
+#include <map>
+
+#include "host/schema.h"
+#include "host/statement.h"
+#include "partnerkit/run_time_error.h"
+
+namespace partnerkit::host {
+namespace {
+
+std::string_view ColumnOf(Counter counter) {
+  switch (counter) {
+    case Counter::kASNNo: return "LastASNNo";
+    case Counter::kInterchangeNo: return "LastInterchangeNo";
+    case Counter::kGroupNo: return "LastGroupNo";
+  }
+  return {};
+}
+
+std::string LoginName() {
+  const passwd* entry = getpwuid(geteuid());
+  return entry != nullptr && entry->pw_name != nullptr ? entry->pw_name : "";
+}
+
+using Kinds = std::vector<MemberKind>;
+
+}  // namespace
+
+bool DropThreadGuards() { return sqlite_api::sqlite3_config(SQLITE_CONFIG_MULTITHREAD) == SQLITE_OK; }
+
+struct SqlHost::Parts {
+  Parts(std::string_view url, const SqlOptions& options) : session(url, options), store(session) {}
+
+  // The statement kept under its own text.
+  Statement& Prepared(const std::string& sql, const Kinds& parameters, const Kinds& columns) {
+    auto& kept = statements[sql];
+    if (!kept) kept = std::make_unique<Statement>(session, sql, parameters, columns);
+    return *kept;
+  }
+
+  SqlSession session;
+  SqlStore store;
+  std::map<std::string, std::unique_ptr<Statement>> statements;
+  std::optional<std::string> userId;
+};
+
+SqlHost::SqlHost(std::unique_ptr<Parts> parts) : parts_(std::move(parts)) {}
+
+SqlHost::~SqlHost() = default;
+
+std::unique_ptr<SqlHost> SqlHost::Open(std::string_view url, const SqlOptions& options) {
+  auto parts = std::make_unique<Parts>(url, options);
+  PrepareSchema(parts->session, AllRecordTypes());
+  return std::unique_ptr<SqlHost>(new SqlHost(std::move(parts)));
+}
+
+SqlStore& SqlHost::Records() { return parts_->store; }
+
+SqlSession& SqlHost::Session() { return parts_->session; }
+
+std::string SqlHost::UserId() {
+  // Every log record asks for it.
+  if (!parts_->userId) parts_->userId = Setting("UserId").value_or(LoginName());
+  return *parts_->userId;
+}
+
+void SqlHost::Commit(std::int32_t) { parts_->session.Commit(); }
+void SqlHost::BeginTrans() { parts_->session.Begin(); }
+void SqlHost::CommitTrans() { parts_->session.CommitExplicit(); }
+
+void SqlHost::RollbackTrans() {
+  parts_->session.RollbackExplicit();
+  parts_->userId.reset();
+}
+
+void SqlHost::Close() { parts_->session.Close(); }
+
+bool SqlHost::DeleteOrder(const Order& order) {
+  SqlSession& session = parts_->session;
+  SqlStore& store = parts_->store;
+  OrderLine line;
+  OrderLocn locn;
+  OrderLocnLine locnLine;
+  line.OrderId = locn.OrderId = locnLine.OrderId = order.OrderId;
+  bool opened = false;
+  bool done = false;
+  try {
+    opened = session.EnsureWriting();
+    session.Execute("SAVEPOINT \"DeleteOrder\"");
+    done = Delete(store, order) && store.DeleteAll(OrderLocnLine::kType, OrderLocnLine::kByOrder, &locnLine) &&
+           store.DeleteAll(OrderLocn::kType, OrderLocn::kByOrder, &locn) &&
+           store.DeleteAll(OrderLine::kType, OrderLine::kByOrder, &line);
+    if (!done) session.Execute("ROLLBACK TO \"DeleteOrder\"");
+    session.Execute("RELEASE \"DeleteOrder\"");
+  } catch (const soci::soci_error& error) {
+    session.Failed(error);
+    done = false;
+  } catch (const RunTimeError&) {
+    done = false;
+  }
+  if (opened && !done) session.Abandon();
+  return done;
+}
+
+std::vector<EDIDoc> SqlHost::EDIDocList() {
+  std::vector<EDIDoc> docs;
+  ForEach<EDIDoc>(parts_->store, [&](const EDIDoc& doc) { docs.push_back(doc); });
+  return docs;
+}
+
+std::int32_t SqlHost::NextNumber(std::string_view partnerId, Counter counter) {
+  SqlSession& session = parts_->session;
+  const std::string column = Quoted(ColumnOf(counter));
+  const std::string table = Quoted(Partner::kType.table);
+  session.Begin();
+  try {
+    const std::int64_t number = session.Guarded([&] {
+      Statement& last = parts_->Prepared("SELECT " + column + " FROM " + table + " WHERE \"PartnerId\"=:p0",
+                                         {MemberKind::kString}, {MemberKind::kLong});
+      last.Parameter(0).Set(partnerId);
+      const bool found = last.Execute();
+      const std::int64_t next = last.Column(0).whole + 1;
+      last.Reset();
+      if (!found) session.Raise("there is no partner \"" + std::string(partnerId) + "\"");
+      if (next > std::numeric_limits<std::int32_t>::max()) {
+        throw RunTimeError(run_time::kOverflow, session.Name() + ": partner " + std::string(partnerId) + " has used up its " +
+                                                    std::string(ColumnOf(counter)));
+      }
+      Statement& move = parts_->Prepared("UPDATE " + table + " SET " + column + "=:p0 WHERE \"PartnerId\"=:p1",
+                                         {MemberKind::kLong, MemberKind::kString}, {});
+      move.Parameter(0).Set(next);
+      move.Parameter(1).Set(partnerId);
+      move.Execute();
+      return next;
+    });
+    session.CommitExplicit();
+    return static_cast<std::int32_t>(number);
+  } catch (...) {
+    session.RollbackExplicit();
+    throw;
+  }
+}
+
+std::optional<std::string> SqlHost::Setting(std::string_view name) {
+  return parts_->session.Guarded([&]() -> std::optional<std::string> {
+    Statement& find = parts_->Prepared("SELECT \"Value\" FROM " + Quoted(kSettingsTable) + " WHERE \"Name\"=:p0",
+                                       {MemberKind::kString}, {MemberKind::kString});
+    find.Parameter(0).Set(name);
+    std::optional<std::string> value;
+    if (find.Execute()) value = find.Column(0).text;
+    find.Reset();
+    return value;
+  });
+}
+
+std::vector<std::pair<std::string, std::string>> SqlHost::Settings() {
+  return parts_->session.Guarded([&] {
+    std::vector<std::pair<std::string, std::string>> settings;
+    Statement& all = parts_->Prepared("SELECT \"Name\",\"Value\" FROM " + Quoted(kSettingsTable) + " ORDER BY \"Name\"", {},
+                                      {MemberKind::kString, MemberKind::kString});
+    for (bool more = all.Execute(); more; more = all.Next()) settings.emplace_back(all.Column(0).text, all.Column(1).text);
+    return settings;
+  });
+}
+
+void SqlHost::SetSetting(std::string_view name, std::string_view value) {
+  parts_->session.Guarded([&] {
+    const Kinds both = {MemberKind::kString, MemberKind::kString};
+    parts_->session.EnsureWriting();
+    Statement& update =
+        parts_->Prepared("UPDATE " + Quoted(kSettingsTable) + " SET \"Value\"=:p0 WHERE \"Name\"=:p1", both, {});
+    update.Parameter(0).Set(value);
+    update.Parameter(1).Set(name);
+    update.Execute();
+    if (update.RowsChanged() > 0) return;
+    Statement& add = parts_->Prepared("INSERT INTO " + Quoted(kSettingsTable) + "(\"Value\",\"Name\") VALUES(:p0,:p1)", both, {});
+    add.Parameter(0).Set(value);
+    add.Parameter(1).Set(name);
+    add.Execute();
+  });
+  if (name == "UserId") parts_->userId = value;
+}
+
+}  // namespace partnerkit::host

@@ -1,0 +1,64 @@
+// The bundled host: records, settings and counters in one SQL database.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "host/sql_options.h"
+#include "host/sql_store.h"
+#include "partnerkit/records.h"
+#include "partnerkit/store.h"
+
+namespace partnerkit::host {
+
+// SQLite guards each of its calls against other threads, which takes an eighth of the time of an import. A program none of
+// whose SQLite connections is shared between threads may do without; to be called before it opens the first. False when
+// that has happened already, and all stays as it is.
+bool DropThreadGuards();
+
+// Changes are grouped as SqlSession tells: `Commit` makes them durable, and so do `Close` and the destructor, since what a
+// failed posting leaves behind is kept for the next run to find. Only a killed program loses what it did not commit.
+// While changes wait for their commit, other programs on the same database wait too.
+class SqlHost : public System {
+ public:
+  // Opens the database and makes or updates its tables. `url` is a file path, with or without "sqlite3://" before it.
+  // Raises RunTimeError (run_time::kDatabase) with a text that names the database and the cause.
+  static std::unique_ptr<SqlHost> Open(std::string_view url, const SqlOptions& options = {});
+  ~SqlHost() override;
+
+  SqlStore& Records() override;
+  // The setting of that name; without one, the name that the user is signed on with.
+  std::string UserId() override;
+  // The stored jobs, packs and ship notices of the order stay.
+  bool DeleteOrder(const Order& order) override;
+  void Commit(std::int32_t mode) override;
+  void BeginTrans() override;
+  void CommitTrans() override;
+  void RollbackTrans() override;
+  std::vector<EDIDoc> EDIDocList() override;
+  std::int32_t NextNumber(std::string_view partnerId, Counter counter) override;
+
+  // Commits what waits for it. Raises RunTimeError.
+  void Close();
+
+  // The host's settings, the members of `System` by name. They raise RunTimeError.
+  std::optional<std::string> Setting(std::string_view name);
+  std::vector<std::pair<std::string, std::string>> Settings();
+  void SetSetting(std::string_view name, std::string_view value);
+
+  SqlSession& Session();
+
+ private:
+  struct Parts;
+
+  explicit SqlHost(std::unique_ptr<Parts> parts);
+
+  std::unique_ptr<Parts> parts_;
+};
+
+}  // namespace partnerkit::host
