@@ -1,0 +1,44 @@
+#include "partnerkit/catalogue.h"
+
+#include <algorithm>
+
+#include "orders/csv/csv_classes.h"
+
+namespace partnerkit {
+
+namespace {
+
+template <class T>
+std::unique_ptr<Translator> Make(const Ports& ports) {
+  return std::make_unique<T>(ports);
+}
+
+// clang-format off
+constexpr PublicClass kClasses[] = {
+    {"PartnerKit.clsMGB850csv", "Purchase order (850)", "in", "CSV", Make<orders::clsMGB850csv>},
+};
+// clang-format on
+
+char Lower(char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; }
+
+bool SameLetters(std::string_view left, std::string_view right) {
+  return std::equal(left.begin(), left.end(), right.begin(), right.end(),
+                    [](char a, char b) { return Lower(a) == Lower(b); });
+}
+
+}  // namespace
+
+std::span<const PublicClass> Catalogue() { return kClasses; }
+
+const PublicClass* FindClass(std::string_view progId) {
+  const auto found = std::find_if(std::begin(kClasses), std::end(kClasses),
+                                  [&](const PublicClass& row) { return SameLetters(row.progId, progId); });
+  return found == std::end(kClasses) ? nullptr : found;
+}
+
+std::unique_ptr<Translator> CreateTranslator(std::string_view progId, const Ports& ports) {
+  const PublicClass* const row = FindClass(progId);
+  return row == nullptr ? nullptr : row->create(ports);
+}
+
+}  // namespace partnerkit

@@ -1,0 +1,58 @@
+// The line in hand of a CSV order file, by field name.
+#pragma once
+
+#include <array>
+#include <span>
+#include <string>
+#include <string_view>
+
+#include "frame/delimited.h"
+#include "frame/field_map.h"
+#include "orders/csv/order_fields.h"
+
+namespace partnerkit::orders {
+
+class CsvOrderLine {
+ public:
+  // Takes the columns of the fields from the map, whose header has `columns` entries.
+  void SetColumns(FieldMap& map, std::size_t columns) {
+    split_ = DelimitedLine(columns);
+    columns_.fill(kNoColumn);
+    for (std::size_t field = 0; field < kOrderFields; ++field) {
+      const MapField* const found = map.Find(kOrderFieldNames[field]);
+      if (found != nullptr && found->FieldIndex >= 0) columns_[field] = static_cast<std::size_t>(found->FieldIndex);
+    }
+  }
+
+  // The columns up to the last of these fields: all that a pass needs that looks at these only.
+  std::size_t ColumnsFor(std::span<const OrderField> fields) const {
+    std::size_t columns = 0;
+    for (const OrderField field : fields) {
+      const std::size_t column = columns_[static_cast<std::size_t>(field)];
+      if (column != kNoColumn && column + 1 > columns) columns = column + 1;
+    }
+    return columns;
+  }
+
+  // Takes a line apart; the text must outlive the views.
+  void Read(std::string_view line) { split_.Split(line); }
+  void Read(std::string_view line, std::size_t columns) { split_.Split(line, columns); }
+
+  // The field as read, and with blanks cut from both ends.
+  std::string_view Raw(OrderField field) const { return split_[columns_[static_cast<std::size_t>(field)]]; }
+  std::string_view operator[](OrderField field) const { return TrimBlanks(Raw(field)); }
+
+  // The fields joined without separator, put into `into`.
+  void Join(std::span<const OrderField> fields, std::string& into) const {
+    into.clear();
+    for (const OrderField field : fields) into += (*this)[field];
+  }
+
+ private:
+  static constexpr std::size_t kNoColumn = static_cast<std::size_t>(-1);
+
+  DelimitedLine split_;
+  std::array<std::size_t, kOrderFields> columns_{};
+};
+
+}  // namespace partnerkit::orders

@@ -1,0 +1,57 @@
+// The rows of an inbound order file between `Load` and `Term`: what was listed, and what is dealt with.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+
+#include "partnerkit/values.h"
+
+namespace partnerkit::orders {
+
+// One transaction of the file, before it is an order. Small on purpose: a file may list hundreds of thousands.
+struct ListedOrder {
+  std::string PONo;
+  std::string InterchangeCtl;
+  std::string GroupCtl;
+  std::string TransactionCtl;
+  std::optional<DateTime> PODate;
+  std::int64_t FilePos = 0;  // of the first line, from 1
+  std::int32_t OrderId = 0;  // of the stored order; 0 when it isn't stored or was turned away
+
+  bool HasControls(std::string_view interchange, std::string_view group, std::string_view transaction) const {
+    return InterchangeCtl == interchange && GroupCtl == group && TransactionCtl == transaction;
+  }
+  // The control numbers joined, as transactions are told apart.
+  std::string Controls() const { return InterchangeCtl + GroupCtl + TransactionCtl; }
+};
+
+struct TextHash {
+  using is_transparent = void;
+  std::size_t operator()(std::string_view text) const { return std::hash<std::string_view>{}(text); }
+};
+
+// The orders that need no further work, by order number: posted, or turned away for good.
+class ProcessedOrders {
+ public:
+  // Of two orders with one number, a posted one stands: its lines belong into the backup, and a second look at the same
+  // number doesn't change that.
+  void Add(const ListedOrder& order) {
+    std::int32_t& id = orders_.try_emplace(order.PONo, 0).first->second;
+    if (order.OrderId > 0) id = order.OrderId;
+  }
+  // The order's id, 0 when it was turned away, nothing when it isn't dealt with.
+  std::optional<std::int32_t> Find(std::string_view PONo) const {
+    const auto found = orders_.find(PONo);
+    return found == orders_.end() ? std::nullopt : std::optional(found->second);
+  }
+  bool Empty() const { return orders_.empty(); }
+  void Clear() { orders_.clear(); }
+
+ private:
+  std::unordered_map<std::string, std::int32_t, TextHash, std::equal_to<>> orders_;
+};
+
+}  // namespace partnerkit::orders

@@ -1,0 +1,26 @@
+// An order in memory: the four kinds of record of one transaction, complete before any of them is stored.
+#pragma once
+
+#include <memory>
+#include <string>
+#include <string_view>
+
+#include "frame/keyed_list.h"
+#include "partnerkit/records.h"
+
+namespace partnerkit::orders {
+
+struct OrderDraft {
+  Order header;
+  OrderLineList lines;          // by product number
+  OrderLocnList locations;      // by buying location
+  OrderLocnLineList locnLines;  // by LocnLineKey
+
+  // A location's number and a product's may run into each other ("1" and "23", "12" and "3"), so the key keeps them
+  // apart.
+  static std::string LocnLineKey(std::string_view buyingLocn, std::string_view productNo) {
+    return std::string(buyingLocn).append(1, '\0').append(productNo);
+  }
+};
+
+}  // namespace partnerkit::orders

@@ -1,0 +1,22 @@
+// Storing a checked order: the one place where an import writes orders, whatever the syntax.
+#pragma once
+
+#include <optional>
+#include <string_view>
+
+#include "frame/translator_base.h"
+#include "orders/order_draft.h"
+
+namespace partnerkit::orders {
+
+// Stores the four kinds of record in their order, the header at Status 9, so that a store that fails half way leaves an
+// order that the next run recognises and replaces. False when a record was refused: the failure is noted, the header's
+// `OrderId` is 0, and what was stored stays. `lineSequence` is what the messages call the line: the sequence of the
+// line last read, or each record's own when it is left out.
+bool StoreDraft(TranslatorBase& translator, CallLog& log, OrderDraft& draft,
+                std::optional<std::string_view> lineSequence = {});
+
+// Marks the stored order complete and makes it durable. False, with the failure reported, when it could not be.
+bool CompleteStoredOrder(TranslatorBase& translator, OrderDraft& draft);
+
+}  // namespace partnerkit::orders
