@@ -24,6 +24,7 @@ inline constexpr std::int32_t kAlreadyOpen = 55;
 inline constexpr std::int32_t kDeviceError = 57;
 inline constexpr std::int32_t kFileExists = 58;
 inline constexpr std::int32_t kDiskFull = 61;
+inline constexpr std::int32_t kPastEnd = 62;
 inline constexpr std::int32_t kTooManyFiles = 67;
 inline constexpr std::int32_t kPermissionDenied = 70;
 inline constexpr std::int32_t kPathAccess = 75;

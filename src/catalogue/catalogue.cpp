@@ -15,7 +15,16 @@ std::unique_ptr<Translator> Make(const Ports& ports) {
 
 // clang-format off
 constexpr PublicClass kClasses[] = {
-    {"PartnerKit.clsMGB850csv", "Purchase order (850)", "in", "CSV", Make<orders::clsMGB850csv>},
+    {"PartnerKit.clsMGB850csv",           "Purchase order (850)", "in", "CSV", Make<orders::clsMGB850csv>},
+    {"PartnerKit.clsTarget850csv",        "Purchase order (850)", "in", "CSV", Make<orders::clsTarget850csv>},
+    {"PartnerKit.clsKMart850csv",         "Purchase order (850)", "in", "CSV", Make<orders::clsKMart850csv>},
+    {"PartnerKit.clsGHPL850csv",          "Purchase order (850)", "in", "CSV", Make<orders::clsGHPL850csv>},
+    {"PartnerKit.clsOfficeworks850csv",   "Purchase order (850)", "in", "CSV", Make<orders::clsOfficeworks850csv>},
+    {"PartnerKit.clsMGBBT850csv",         "Purchase order (850)", "in", "CSV", Make<orders::clsMGBBT850csv>},
+    {"PartnerKit.clsCMLFLFPOcsv",         "Purchase order (850)", "in", "CSV", Make<orders::clsCMLFLFPOcsv>},
+    {"PartnerKit.clsColesEIDCPOcsv",      "Purchase order (850)", "in", "CSV", Make<orders::clsColesEIDCPOcsv>},
+    {"PartnerKit.clsMYERDropShipPOcsv",   "Purchase order (850)", "in", "CSV", Make<orders::clsMYERDropShipPOcsv>},
+    {"PartnerKit.clsTargetBulkPOcsv",     "Purchase order (850)", "in", "CSV", Make<orders::clsTargetBulkPOcsv>},
 };
 // clang-format on
 

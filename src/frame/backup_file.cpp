@@ -18,6 +18,32 @@ namespace {
 constexpr std::string_view kNoteHead = "partnerkit backup 1";
 constexpr std::string_view kNoteFoot = "end";
 
+// A path on one line: line ends, and the mark itself, as "%" and two digits.
+std::string Escaped(std::string_view path) {
+  std::string escaped;
+  for (const char c : path) {
+    if (c == '%') escaped += "%25";
+    else if (c == '\n') escaped += "%0A";
+    else if (c == '\r') escaped += "%0D";
+    else escaped += c;
+  }
+  return escaped;
+}
+
+std::string Unescaped(std::string_view line) {
+  std::string path;
+  for (std::size_t at = 0; at < line.size(); ++at) {
+    if (line[at] != '%') {
+      path += line[at];
+      continue;
+    }
+    const std::string_view code = line.substr(at + 1, 2);
+    path += code == "0A" ? '\n' : code == "0D" ? '\r' : '%';
+    at += 2;
+  }
+  return path;
+}
+
 std::optional<std::uint64_t> Whole(std::string_view text) {
   std::uint64_t value = 0;
   const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
@@ -37,7 +63,7 @@ std::optional<BackupFile::Note> BackupFile::ReadNote(InputFile& file) {
   const auto base = Whole(line.text);
   if (!base || !lines.Read(line)) return std::nullopt;
   note.base = *base;
-  note.sourcePath = line.text;
+  note.sourcePath = Unescaped(line.text);
   if (!lines.Read(line)) return std::nullopt;
   note.sourceIdentity = line.text;
   while (lines.Read(line)) {
@@ -90,7 +116,7 @@ void BackupFile::Settle() {
 void BackupFile::WriteNote(InputFile& source, const std::string& sourcePath, const std::vector<ByteRange>& ranges) {
   const std::string draft = NotePath() + ".tmp";
   const std::unique_ptr<OutputFile> note = files_.OpenOutput(draft, OutputMode::kReplace);
-  note->Write(std::string(kNoteHead) + '\n' + std::to_string(file_->Length()) + '\n' + sourcePath + '\n' +
+  note->Write(std::string(kNoteHead) + '\n' + std::to_string(file_->Length()) + '\n' + Escaped(sourcePath) + '\n' +
               source.Identity() + '\n');
   for (const ByteRange& range : ranges) {
     note->Write(std::to_string(range.begin) + ' ' + std::to_string(range.end) + '\n');

@@ -35,7 +35,10 @@ bool FreeFormatReader::Read(std::vector<std::string>& items) {
   std::string_view text = line.text;
   for (bool more = true; more;) items.push_back(TakeItem(text, more));
   if (items.size() != columns_) {
-    throw RunTimeError(run_time::kTypeMismatch, "File " + path_ + ", line " + std::to_string(lineNo_) + " has " +
+    // The same line is met again when it is read again.
+    lines_.Seek(line.position);
+    --lineNo_;
+    throw RunTimeError(run_time::kTypeMismatch, "File " + path_ + ", line " + std::to_string(lineNo_ + 1) + " has " +
                                                     std::to_string(items.size()) + " columns instead of " +
                                                     std::to_string(columns_));
   }

@@ -154,6 +154,12 @@ double Plus(double left, double right) {
   return sum;
 }
 
+double Times(double left, double right) {
+  const double product = left * right;
+  if (!std::isfinite(product)) RaiseOverflow();
+  return product;
+}
+
 Decimal DecimalOf(double value) {
   if (!std::isfinite(value)) RaiseOverflow();
   if (value == 0) return {};

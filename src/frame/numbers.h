@@ -24,8 +24,9 @@ double RoundHalfEven(double value, int digits);
 // The shortest text of up to 15 significant digits: "10.5", "0.1", "-3", "1E+20".
 std::string NumberText(double value);
 
-// The sum; raises error 6 when it leaves the range of a double.
+// The sum and the product; raise error 6 when they leave the range of a double.
 double Plus(double left, double right);
+double Times(double left, double right);
 
 // A number in decimal: 0.DIGITS times ten to the power of `point`.
 struct Decimal {

@@ -21,9 +21,6 @@ struct ListedOrder {
   std::int64_t FilePos = 0;  // of the first line, from 1
   std::int32_t OrderId = 0;  // of the stored order; 0 when it isn't stored or was turned away
 
-  bool HasControls(std::string_view interchange, std::string_view group, std::string_view transaction) const {
-    return InterchangeCtl == interchange && GroupCtl == group && TransactionCtl == transaction;
-  }
   // The control numbers joined, as transactions are told apart.
   std::string Controls() const { return InterchangeCtl + GroupCtl + TransactionCtl; }
 };
@@ -33,18 +30,18 @@ struct TextHash {
   std::size_t operator()(std::string_view text) const { return std::hash<std::string_view>{}(text); }
 };
 
-// The orders that need no further work, by order number: posted, or turned away for good.
+// The orders that need no further work, posted or turned away for good, by the key that their lines are known by.
 class ProcessedOrders {
  public:
-  // Of two orders with one number, a posted one stands: its lines belong into the backup, and a second look at the same
+  // Of two orders with one key, a posted one stands: its lines belong into the backup, and a second look at the same
   // number doesn't change that.
-  void Add(const ListedOrder& order) {
-    std::int32_t& id = orders_.try_emplace(order.PONo, 0).first->second;
-    if (order.OrderId > 0) id = order.OrderId;
+  void Add(std::string_view key, std::int32_t orderId) {
+    std::int32_t& id = orders_.try_emplace(std::string(key), 0).first->second;
+    if (orderId > 0) id = orderId;
   }
   // The order's id, 0 when it was turned away, nothing when it isn't dealt with.
-  std::optional<std::int32_t> Find(std::string_view PONo) const {
-    const auto found = orders_.find(PONo);
+  std::optional<std::int32_t> Find(std::string_view key) const {
+    const auto found = orders_.find(key);
     return found == orders_.end() ? std::nullopt : std::optional(found->second);
   }
   bool Empty() const { return orders_.empty(); }

@@ -4,68 +4,109 @@
 
 namespace partnerkit::orders {
 
-void OrderChecks::Reject(std::string_view message) {
-  ok_ = false;
-  log_.Note(kRejection, opening_ + std::string(message));
+std::string Disagreement(std::string_view productNo, std::string_view what, std::string_view claimed,
+                         std::string_view name, std::string_view stored) {
+  return std::string("product ")
+      .append(productNo)
+      .append(what)
+      .append(claimed)
+      .append(" does not agree with database ")
+      .append(name)
+      .append(stored);
 }
 
-void OrderChecks::CheckProduct(const LineClaims& line) {
+void OrderChecks::Reject(std::string_view message) {
+  constexpr CheckRules kUsual;
+  ok_ = false;
+  log_.Note(kRejection, Opening(kUsual.before, kUsual.after).append(message));
+}
+
+void OrderChecks::RejectProduct(std::string_view message) {
+  if (faultsPass_) {
+    errors_ = true;
+  } else {
+    ok_ = false;
+  }
+  log_.Note(kRejection, Opening(rules_.before, rules_.after).append(message));
+}
+
+bool OrderChecks::IsPartners(const std::string& partnerId) {
+  const Partner& partner = translator_.TradingPartner();
+  if (partnerId == partner.PartnerId) return true;
+  if (!rules_.sameABN || Str(partner.ABN).empty()) return false;
+  Partner other;
+  other.PartnerId = partnerId;
+  return translator_.Try([&] { return Load(translator_.Records(), other); }) && Str(other.ABN) == Str(partner.ABN);
+}
+
+std::optional<Product> OrderChecks::CheckProduct(const LineClaims& line) {
   const std::string number(line.productNo);
   Product product;
   product.ProductNo = number;
   if (!translator_.Try([&] { return Load(translator_.Records(), product); })) {
-    return Reject("product " + number + " does not exist.");
+    RejectProduct("product " + number + " does not exist.");
+    return std::nullopt;
   }
-  const std::string& partnerId = translator_.TradingPartner().PartnerId;
-  if (product.PartnerId != partnerId) {
-    return Reject("product " + number + " does not exist for vendor " + partnerId);
+  if (rules_.vendor && !IsPartners(product.PartnerId)) {
+    RejectProduct("product " + number + " does not exist for vendor " + translator_.TradingPartner().PartnerId);
+    return std::nullopt;
   }
-  if (Str(product.UOM) != line.uom) {
-    return Reject("product " + number + " UOM " + std::string(line.uom) + " does not agree with database UOM " +
-                  std::string(Str(product.UOM)));
+  if (rules_.uom && Str(product.UOM) != line.uom) {
+    RejectProduct(Disagreement(number, " UOM ", line.uom, "UOM ", Str(product.UOM)));
+    return std::nullopt;
   }
-  if (Str(product.Symbology) != line.qualifier) {
-    Reject("barcode " + number + " symbology " + std::string(line.qualifier) +
-           " does not agree with database symbology " + std::string(Str(product.Symbology)));
+  if (rules_.symbology == Symbology::kSkip || Str(product.Symbology) == line.qualifier) return product;
+  const std::string difference = "barcode " + number + " symbology " + std::string(line.qualifier) +
+                                 " does not agree with database symbology " + std::string(Str(product.Symbology));
+  if (rules_.symbology == Symbology::kWarn) {
+    log_.Note(kRejection, Opening("...Warning PO ", ", ") + difference);
+    return product;
   }
+  RejectProduct(difference);
+  return std::nullopt;
+}
+
+ProductPrice OrderChecks::ReadPrice(std::string_view productNo) {
+  ProductPrice price;
+  price.VendorId = translator_.OwnCompany().VendorId;
+  price.ProductNo = productNo;
+  if (!translator_.Try([&] { return Load(translator_.Records(), price); })) {
+    RejectProduct("pricing details for product " + price.ProductNo + " does not exist.");
+  }
+  return price;
 }
 
 void OrderChecks::CheckPrice(const LineClaims& line) {
   const EDIDoc& document = translator_.Document();
-  const std::string number(line.productNo);
-  ProductPrice price;
-  price.VendorId = translator_.OwnCompany().VendorId;
-  price.ProductNo = number;
-  if (!translator_.Try([&] { return Load(translator_.Records(), price); })) {
-    Reject("pricing details for product " + number + " does not exist.");
-  }
-  const auto differs = [&](std::string_view what, std::string_view claimed, std::string_view name,
-                           std::string_view stored) {
-    Reject("product " + number + std::string(what) + std::string(claimed) + " does not agree with database " +
-           std::string(name) + std::string(stored));
-  };
+  const ProductPrice price = ReadPrice(line.productNo);
   if (document.ValidateCost && translator_.Try([&] { return price.Cost != NumberAtStart(line.cost); })) {
-    differs(" cost price ", line.cost, "cost ", NumberText(price.Cost));
+    RejectProduct(Disagreement(line.productNo, " cost price ", line.cost, "cost ", NumberText(price.Cost)));
   }
-  if (!document.ValidateRetail) return;
-  if (translator_.Try([&] { return price.Retail.value_or(0) != NumberAtStart(line.retail); })) {
-    differs(" retail price ", line.retail, "retail ", NumberText(price.Retail.value_or(0)));
+  if (!document.ValidateRetail || !rules_.retail) return;
+  const double retail = price.Retail.value_or(0);
+  if (translator_.Try([&] { return retail != NumberAtStart(line.retail); })) {
+    RejectProduct(Disagreement(line.productNo, " retail price ", line.retail, "retail ", NumberText(retail)));
   }
-  if (Str(price.SKU) != line.sku) differs(" SKU ", line.sku, "SKU ", Str(price.SKU));
+  if (Str(price.SKU) != line.sku) {
+    RejectProduct(Disagreement(line.productNo, " SKU ", line.sku, "SKU ", Str(price.SKU)));
+  }
 }
 
-bool OrderChecks::LocationExists(std::string_view locationNo) {
-  if (const auto known = locations_.find(locationNo); known != locations_.end()) return known->second;
-  PartnerLocn location;
-  location.VendorId = translator_.OwnCompany().VendorId;
-  location.PartnerLocnNo = std::string(locationNo);
-  const bool exists = translator_.Try([&] { return Load(translator_.Records(), location); });
-  return locations_[location.PartnerLocnNo] = exists;
+const PartnerLocn* OrderChecks::FindLocation(std::string_view locationNo) {
+  auto known = locations_.find(locationNo);
+  if (known == locations_.end()) {
+    PartnerLocn location;
+    location.VendorId = translator_.OwnCompany().VendorId;
+    location.PartnerLocnNo = locationNo;
+    const bool exists = translator_.Try([&] { return Load(translator_.Records(), location); });
+    known = locations_.emplace(locationNo, exists ? std::optional(std::move(location)) : std::nullopt).first;
+  }
+  return known->second ? &*known->second : nullptr;
 }
 
 void OrderChecks::CheckLocation(std::string_view what, std::string_view locationNo) {
-  if (!LocationExists(locationNo)) {
-    Reject(std::string(what) + " location " + std::string(locationNo) + " does not exist.");
+  if (FindLocation(locationNo) == nullptr) {
+    Reject(std::string(what).append(" location ").append(locationNo).append(" does not exist."));
   }
 }
 

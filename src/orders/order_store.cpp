@@ -35,7 +35,7 @@ class Storing {
 
   bool LocationLines() {
     for (const auto& locnLine : draft_.locnLines) {
-      const auto line = draft_.lines.Find(locnLine->ProductNo);
+      const auto line = draft_.lines.Find(OrderDraft::LineKey(*locnLine));
       const auto location = draft_.locations.Find(locnLine->BuyingLocn);
       locnLine->OrderId = draft_.header.OrderId;
       locnLine->LineId = line->LineId;
@@ -78,15 +78,15 @@ bool StoreDraft(TranslatorBase& translator, CallLog& log, OrderDraft& draft,
   return storing.Header() && storing.Lines() && storing.Locations() && storing.LocationLines();
 }
 
-bool CompleteStoredOrder(TranslatorBase& translator, OrderDraft& draft) {
-  draft.header.Status = 0;
-  const bool updated = translator.Try([&] {
+bool MakeDurable(TranslatorBase& translator, OrderDraft& draft, bool complete) {
+  const auto markComplete = [&] {
+    draft.header.Status = 0;
     if (!Update(translator.Records(), draft.header)) {
       throw RunTimeError(run_time::kDatabase, "PO " + draft.header.PONo + " cannot be marked complete");
     }
-    return true;
-  });
-  return translator.Try([&] { translator.Host().Commit(0); }) && updated;
+  };
+  if (complete && !translator.Try(markComplete)) return false;
+  return translator.Try([&] { translator.Host().Commit(0); });
 }
 
 }  // namespace partnerkit::orders

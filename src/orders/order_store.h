@@ -16,7 +16,8 @@ namespace partnerkit::orders {
 bool StoreDraft(TranslatorBase& translator, CallLog& log, OrderDraft& draft,
                 std::optional<std::string_view> lineSequence = {});
 
-// Marks the stored order complete and makes it durable. False, with the failure reported, when it could not be.
-bool CompleteStoredOrder(TranslatorBase& translator, OrderDraft& draft);
+// Makes the stored order durable, marked complete unless its faults are still to be settled. False, with the failure
+// reported, when it could not be.
+bool MakeDurable(TranslatorBase& translator, OrderDraft& draft, bool complete);
 
 }  // namespace partnerkit::orders

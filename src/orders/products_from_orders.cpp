@@ -28,15 +28,15 @@ void SetStyle(Product& product, std::string_view style, std::string_view colour,
   product.Size = size;
 }
 
-void FillFromLine(const TranslatorBase& translator, const ProductOfLine& line, Product& product) {
+void FillFromLine(TranslatorBase& translator, const ProductOfLine& line, Product& product) {
   SetStyle(product, line.style, line.colour, line.size);
   SetDefaults(translator, product);
   product.Description = std::string(line.description);
   product.UOM = line.uom.empty() ? "EA" : std::string(line.uom);
   product.Bin = std::string(line.bin);
-  const double weight = NumberAtStart(line.weight);
+  const double weight = translator.Try([&] { return NumberAtStart(line.weight); });
   product.Weight = weight == 0 ? kLeastWeight : weight;
-  product.Volume = NumberAtStart(line.volume);
+  product.Volume = translator.Try([&] { return NumberAtStart(line.volume); });
 }
 
 // The columns of the product file, counted from 1.
@@ -65,16 +65,19 @@ bool ImportOneProduct(TranslatorBase& translator, const ImportRecord& record) {
   Product product;
   SetStyle(product, record[1], record[2], record[3]);
   Find(store, Product::kByStyle, product);
-  if (IsNumber(product.ProductNo) && product.ProductNo != record[7]) {
+  bool known = IsNumber(product.ProductNo);
+  if (known && product.ProductNo != record[7]) {
     ProductPrice price;
     price.ProductNo = product.ProductNo;
     price.VendorId = translator.OwnCompany().VendorId;
     Delete(store, price);
     if (!Delete(store, product)) return false;
-    product = {};
+    known = false;
   }
-  const bool known = IsNumber(product.ProductNo);
-  if (!known) product.ProductNo = record[7];
+  if (!known) {
+    product = {};
+    product.ProductNo = record[7];
+  }
   FillFromImport(translator, record, product);
   return known ? Update(store, product) : Add(store, product);
 }
@@ -114,16 +117,17 @@ void AddProduct(TranslatorBase& translator, const ProductOfLine& line) {
     Product product;
     SetStyle(product, line.style, line.colour, line.size);
     translator.Try([&] { return Find(store, Product::kByStyle, product); });
-    if (IsNumber(product.ProductNo) && product.ProductNo != line.numberAsRead) {
+    bool known = IsNumber(product.ProductNo);
+    if (known && product.ProductNo != line.numberAsRead) {
       if (!translator.Try([&] { return Delete(store, product); })) return;
-      product = {};
+      known = false;
     }
-    const bool known = IsNumber(product.ProductNo);
-    if (!known) product.ProductNo = TrimBlanks(line.numberAsRead);
-    translator.Try([&] {
-      FillFromLine(translator, line, product);
-      return known ? Update(store, product) : Add(store, product);
-    });
+    if (!known) {
+      product = {};
+      product.ProductNo = TrimBlanks(line.numberAsRead);
+    }
+    FillFromLine(translator, line, product);
+    translator.Try([&] { return known ? Update(store, product) : Add(store, product); });
   });
 }
 

@@ -5,39 +5,18 @@
 // in full; a partner's class gives its values and overrides the steps it does otherwise.
 #pragma once
 
-#include <span>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include "frame/field_map.h"
-#include "frame/translator_base.h"
 #include "frame/work_queue.h"
 #include "orders/csv/csv_order_line.h"
+#include "orders/csv/csv_order_values.h"
 #include "orders/listed_order.h"
-#include "orders/order_checks.h"
 #include "orders/order_draft.h"
-#include "orders/stored_order.h"
 
 namespace partnerkit::orders {
-
-// What a line of one transaction has in common, and what tells the transaction's first line when it comes again.
-inline constexpr OrderField kTransactionKey[] = {OrderField::INTCONTROLNO, OrderField::GRPCONTROLNO,
-                                                 OrderField::TRNCONTROLNO};
-inline constexpr OrderField kLineKey[] = {OrderField::PONUMBER, OrderField::SEQUENTIALLINENO,
-                                          OrderField::BUYINGLOCPARTNERNO, OrderField::INCOMINGPRODUCTNO};
-
-// What a partner's importer does in its own way, in the order of the family's story.
-struct CsvOrderValues {
-  std::string_view className;                  // "clsMGB850csv"
-  std::span<const OrderField> expectedFields;  // must be in the map file; the first missing one is reported
-  std::span<const OrderField> lineKey = kLineKey;
-  CheckWords checkWords = {};
-  bool importsProducts = true;  // a product file of the vendor is read at the end of listing
-  std::span<const StoredOrderRule> storedOrder;
-  std::string_view cancelCodes = "01 1";   // purpose codes that cancel
-  std::string_view directToStore = "DTS";  // a ship-to of this name is the buying location; empty: no such rule
-};
 
 class CsvOrderImporter : public TranslatorBase {
  public:
@@ -48,7 +27,7 @@ class CsvOrderImporter : public TranslatorBase {
   bool Term() override;
   void Cancel() override;
 
-  // Splits a line as this class does; entries beyond the line's columns stay as they are.
+  // Splits a line as this class does; an entry whose column is left out, or beyond the line's, stays as it is.
   void SetFields(std::string_view aLine, std::vector<std::string>& aFields) const;
 
  protected:
@@ -56,9 +35,10 @@ class CsvOrderImporter : public TranslatorBase {
 
   // One call of `Process`.
   struct Posting {
-    Posting(CsvOrderImporter& importer, ListedOrder& listed, ErrorList& errorList);
+    Posting(CsvOrderImporter& importer, ListedOrder& listed, const PostingValues& postingValues, ErrorList& errorList);
 
     ListedOrder& entry;
+    const PostingValues& values;
     CallLog log;
     OrderDraft draft;
     OrderChecks checks;
@@ -69,24 +49,57 @@ class CsvOrderImporter : public TranslatorBase {
     std::string locationLookedAt;
   };
 
+  // The line's product: the number it is ordered by, and the product that stands for.
+  struct LineProduct {
+    std::string ordered;
+    std::string productNo;
+    Text GTIN = {};
+  };
+
   enum class Next { kGoOn, kEnd };
 
-  // The steps of a posting, each with the partners' norm. One that ends the call leaves 0 as its result.
-  virtual Next SettleStoredOrder(Posting& posting);
-  virtual Next RefuseCancellationOfNothing(Posting& posting);
+  // --- Steps of the listing
+  // The number that the line's order is listed, posted and settled under; `number` may hold it on return.
+  virtual std::string_view OrderNumber(std::string& number) const;
+
+  // --- Steps of a posting, in their order
+  // How the order whose first line is in hand is posted.
+  virtual const PostingValues& ValuesOf() const { return values_.posting; }
+  // Before anything else; False, with the reason noted, ends the call there.
+  virtual bool BeginPosting(Posting&) { return true; }
   virtual void FillHeader(Posting& posting);
-  virtual Next ReadLines(Posting& posting);
-  virtual void CheckLineProduct(Posting& posting);
-  virtual void FillLine(OrderLine& line);
+  virtual bool LineCounts() { return true; }
+  // Ends the call when the line in hand does away with the order.
+  virtual Next LookAtLine(Posting&) { return Next::kGoOn; }
+  // Checks the line's product and says which it is.
+  virtual LineProduct CheckLineProduct(Posting& posting);
+  // A further check of the product that passed the usual ones.
+  virtual void CheckFoundProduct(Posting&, const Product&) {}
+  virtual double LineQuantity(const Posting& posting);
+  virtual void FillLine(Posting& posting, OrderLine& line);
   virtual void CheckLineLocations(Posting& posting);
-  virtual void FillLocation(OrderLocn& location);
-  virtual void FillLocationLine(OrderLocnLine& locnLine);
+  virtual void FillLocationLine(const Posting& posting, OrderLocnLine& locnLine);
+
+  // Posts the row by these values, or by those of its first line when there are none.
+  std::int32_t PostRow(std::int32_t row, const PostingValues* values, ErrorList& errorList);
 
   // The field of the line in hand, blanks cut.
   std::string_view operator[](OrderField field) const { return line_[field]; }
-
+  // The number at the field's start; 0 when it is out of range and the user says to go on.
+  double NumberOf(OrderField field);
+  // An advertised date as some partners want it back: the last four characters of a long one.
+  static std::string AdvertisedText(std::string_view date);
+  std::string_view BuyingLocn() const;
+  bool AsksForPrices() const { return Document().ValidateCost || Document().ValidateRetail; }
+  // The line's claims about its product, which goes by this number.
+  LineClaims Claims(std::string_view productNo) const;
+  void FitProductMaster();
+  void CheckShipTo(Posting& posting, std::string_view wanted);
+  void CheckBuyingLocn(Posting& posting);
   // Marks the entry as dealt with for good without being stored: its lines leave the file.
   Next TurnAway(Posting& posting);
+
+  const CsvOrderValues& values_;
 
  private:
   bool OpenMapFile(const std::string& path);
@@ -96,23 +109,34 @@ class CsvOrderImporter : public TranslatorBase {
   bool HoldOrderFile(const std::string& path);
   void ListTransactions();
   bool IsOurs() const;
+  void JoinLineKey(std::string& key) const;
   void FillRows(RowTable& rows) const;
   bool ReadLine(Line& line);
   ListedOrder* EntryOfRow(std::int32_t row);
 
   bool SettleFile();
   void DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRange>& posted);
+  void SettledKey(std::string& key, std::string& number) const;
+  void MarkProcessed(const ListedOrder& entry);
   void DeleteWhenEmpty();
   void CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t begin, std::uint64_t end);
 
   Next StartPosting(Posting& posting);
+  bool SeekTo(const ListedOrder& entry);
   bool NextLine(Posting& posting);
+  OrderFacts Facts(const Posting& posting) const;
+  Next SettleStoredOrder(Posting& posting);
+  Next CarryOut(Posting& posting, const OrderRule& rule, const Order& stored);
   bool HasJobs(const Order& stored);
+  Next RefuseNewOrder(Posting& posting);
+  void NoteRule(Posting& posting, const OrderRule& rule);
+  Next ReadLines(Posting& posting);
+  bool EndsTransaction(const Posting& posting, std::string& key) const;
   Next TakeLine(Posting& posting);
-  Next AddToLocation(Posting& posting, const std::string& productNo);
-  std::int32_t Post(Posting& posting);
+  void TakeLocation(Posting& posting);
+  Next AddToLocation(Posting& posting, const LineProduct& product);
+  std::int32_t Store(Posting& posting);
 
-  const CsvOrderValues& values_;
   FieldMap fieldMap_;
   MapHeader mapHeader_;
   bool mapLoaded_ = false;

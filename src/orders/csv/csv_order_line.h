@@ -15,8 +15,8 @@ namespace partnerkit::orders {
 class CsvOrderLine {
  public:
   // Takes the columns of the fields from the map, whose header has `columns` entries.
-  void SetColumns(FieldMap& map, std::size_t columns) {
-    split_ = DelimitedLine(columns);
+  void SetColumns(FieldMap& map, std::size_t columns, bool quotesProtectCommas) {
+    split_ = DelimitedLine(columns, quotesProtectCommas);
     columns_.fill(kNoColumn);
     for (std::size_t field = 0; field < kOrderFields; ++field) {
       const MapField* const found = map.Find(kOrderFieldNames[field]);

@@ -1,4 +1,4 @@
-// Listing a CSV order file and settling it: everything round the posting of its orders.
+// Listing a CSV order file: from the map and the file to the rows.
 #include <algorithm>
 
 #include "frame/dates.h"
@@ -12,19 +12,18 @@ namespace {
 
 // What listing looks at in a line.
 constexpr OrderField kListingFields[] = {
-    OrderField::INTCONTROLNO,   OrderField::GRPCONTROLNO, OrderField::TRNCONTROLNO, OrderField::PARTNEREDIADDR,
-    OrderField::COMPANYEDIADDR, OrderField::PONUMBER,     OrderField::PODATE};
-constexpr OrderField kNumberField[] = {OrderField::PONUMBER};
+    OrderField::INTCONTROLNO,   OrderField::GRPCONTROLNO, OrderField::TRNCONTROLNO,      OrderField::PARTNEREDIADDR,
+    OrderField::COMPANYEDIADDR, OrderField::PODATE,       OrderField::SHIPTOLOCPARTNERNO};
 
-constexpr std::string_view kDeleteOnEmpty = "#%DELETEONEMPTY";
-
-// Adds a line to the ranges; lines that follow each other make one range.
-void Extend(std::vector<ByteRange>& ranges, const Line& line) {
-  if (!ranges.empty() && ranges.back().end == line.position) {
-    ranges.back().end = line.End();
-  } else {
-    ranges.push_back({line.position, line.End()});
+// The usual fields without those that the partner doesn't send, then those that only it sends.
+std::vector<OrderField> ExpectedFields(const CsvOrderValues& values) {
+  std::vector<OrderField> fields;
+  for (std::size_t field = 0; field < kUsualOrderFields; ++field) {
+    const auto usual = static_cast<OrderField>(field);
+    if (std::ranges::find(values.removed, usual) == values.removed.end()) fields.push_back(usual);
   }
+  fields.insert(fields.end(), values.added.begin(), values.added.end());
+  return fields;
 }
 
 }  // namespace
@@ -67,7 +66,7 @@ std::int32_t CsvOrderImporter::Load(const std::string& a_sFileName, RowTable& a_
 bool CsvOrderImporter::OpenMapFile(const std::string& path) {
   return Procedure("Function OpenMapFile", false, [&](bool& open) {
     if (!TakeMapFile(path) || !ExpectFields()) return;
-    line_.SetColumns(fieldMap_, mapHeader_.size());
+    line_.SetColumns(fieldMap_, mapHeader_.size(), values_.quotesProtectCommas);
     open = mapLoaded_ = true;
   });
 }
@@ -98,13 +97,14 @@ bool CsvOrderImporter::TakeMapFile(const std::string& path) {
 
 bool CsvOrderImporter::ExpectFields() {
   fieldMap_.Clear();
-  for (const OrderField expected : values_.expectedFields) {
-    if (FindColumn(mapHeader_, fieldMap_.Add(Name(expected)))) continue;
+  for (const OrderField field : ExpectedFields(values_)) {
+    if (FindColumn(mapHeader_, fieldMap_.Add(Name(field)))) continue;
     WriteLog(kWarning, "OpenMapFile",
-             "Expected field " + std::string(Name(expected)) + " not found. \r\n Add this item to your " +
+             "Expected field " + std::string(Name(field)) + " not found. \r\n Add this item to your " +
                  std::string(Str(Document().MapFile)) + " file.");
     return false;
   }
+  for (const OrderField field : values_.optional) FindColumn(mapHeader_, fieldMap_.Add(Name(field)));
   return true;
 }
 
@@ -137,24 +137,35 @@ bool CsvOrderImporter::HoldOrderFile(const std::string& path) {
 }
 
 void CsvOrderImporter::ListTransactions() {
-  const std::size_t columns = std::max(line_.ColumnsFor(kListingFields), line_.ColumnsFor(values_.lineKey));
-  std::string lastTransaction, firstLine, transaction, lineKey;
+  const std::size_t columns = std::max(
+      {line_.ColumnsFor(kListingFields), line_.ColumnsFor(values_.lineKey), line_.ColumnsFor(values_.orderKey)});
+  std::string lastTransaction, firstLine, transaction, lineKey, number;
   for (Line line; ReadLine(line);) {
+    if (values_.skipsBlankLines && TrimBlanks(line.text).empty()) continue;
     line_.Read(line.text, columns);
-    line_.Join(kTransactionKey, transaction);
-    line_.Join(values_.lineKey, lineKey);
+    line_.Join(values_.transactionKey, transaction);
+    JoinLineKey(lineKey);
     if (transaction == lastTransaction && lineKey != firstLine) continue;
     // A foreign transaction leaves the keys alone: each of its lines is looked at, and passed over, again.
     if (!IsOurs()) continue;
     ListedOrder& entry = listed_.emplace_back();
     entry.InterchangeCtl = line_[OrderField::INTCONTROLNO];
-    entry.GroupCtl = line_[OrderField::GRPCONTROLNO];
+    if (values_.transactionKey.size() == std::size(kTransactionKey)) entry.GroupCtl = line_[OrderField::GRPCONTROLNO];
     entry.TransactionCtl = line_[OrderField::TRNCONTROLNO];
-    entry.PONo = line_[OrderField::PONUMBER];
+    entry.PONo = OrderNumber(number);
     entry.PODate = OrderDate(line_[OrderField::PODATE]);
     entry.FilePos = static_cast<std::int64_t>(line.position);
     lastTransaction = transaction;
     firstLine = lineKey;
+  }
+}
+
+std::string_view CsvOrderImporter::OrderNumber(std::string&) const { return line_[OrderField::PONUMBER]; }
+
+void CsvOrderImporter::JoinLineKey(std::string& key) const {
+  key.clear();
+  for (const OrderField field : values_.lineKey) {
+    key += field == OrderField::BUYINGLOCPARTNERNO ? BuyingLocn() : line_[field];
   }
 }
 
@@ -174,122 +185,19 @@ void CsvOrderImporter::FillRows(RowTable& rows) const {
   }
 }
 
-// Reads the order file's next line. False at its end.
+// Reads the order file's next line. False at its end. A line that cannot be read leaves the procedure even when the
+// user says to go on: taken for the end of the file, it would cut an order short.
 bool CsvOrderImporter::ReadLine(Line& line) {
-  return Try([&] { return queue_.Lines().Read(line); });
-}
-
-bool CsvOrderImporter::Term() {
-  return Procedure("Function Term", false, [&](bool& done) {
-    Try([&] { queue_.File(); });
-    if (!processed_.Empty()) {
-      // Nothing leaves the file before the store holds it for good.
-      Try([&] { Host().Commit(0); });
-      if (!SettleFile()) return;
-    }
-    queue_.Close();
-    Try([&] { backup_.Close(); });
-    DeleteWhenEmpty();
-    done = true;
-  });
-}
-
-// Rewrites the file without the orders dealt with; the lines of the posted ones go to the backup.
-bool CsvOrderImporter::SettleFile() {
-  WorkQueue::Rewrite rewrite(queue_);
-  std::vector<ByteRange> posted;
-  if (!Try([&] { DealOut(rewrite, posted); })) return false;
-  if (backup_.IsOpen() && !Try([&] { backup_.Append(queue_.File(), queue_.Path(), posted); })) return false;
-  if (!Try([&] { rewrite.Claim(); })) return false;
-  {
-    const HandlerOff off(Errors());
-    Try([&] { rewrite.Replace(); });
-  }
-  return Try([&] { backup_.Settle(); });
-}
-
-// Copies what stays to the temporary file and collects the posted ranges.
-void CsvOrderImporter::DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRange>& posted) {
-  rewrite.Begin();
-  posted.clear();
-  const std::size_t columns = line_.ColumnsFor(kNumberField);
-  std::string number;
-  std::optional<std::int32_t> outcome = processed_.Find(number);
-  LineReader& lines = queue_.Lines();
-  lines.Seek(1);
-  do {
-    for (Line line; lines.Read(line);) {
-      line_.Read(line.text, columns);
-      if (const std::string_view here = line_[OrderField::PONUMBER]; here != number) {
-        number = here;
-        outcome = processed_.Find(number);
-      }
-      if (!outcome) {
-        rewrite.Keep(line);
-      } else if (*outcome > 0) {
-        Extend(posted, line);
-      }
-    }
-    rewrite.Finish();
-    // A mailbox that doesn't ask for the hold may have added lines meanwhile.
-  } while (queue_.File().Length() >= lines.Position());
-}
-
-void CsvOrderImporter::DeleteWhenEmpty() {
-  if (Str(Document().Options) != kDeleteOnEmpty) return;
-  const HandlerOff off(Errors());
-  Try([&] {
-    if (FileSystem().Length(fileName_) == 0) FileSystem().Delete(fileName_);
-  });
-}
-
-bool CsvOrderImporter::Delete(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
-  return Procedure("Function Delete", false, [&](bool& done) {
-    CallLog log(*this, "Delete", vtErrorLog);
-    const ListedOrder* const entry = EntryOfRow(a_lRowNum);
-    if (entry == nullptr) return;
-    const auto begin = static_cast<std::uint64_t>(entry->FilePos);
-    std::uint64_t end = 0;
-    if (entry != &listed_.back()) {
-      end = static_cast<std::uint64_t>(entry[1].FilePos);
-    } else if (!Try([&] { end = queue_.File().Length() + 1; })) {
-      return;
-    }
-    WorkQueue::Rewrite rewrite(queue_);
-    if (!Try([&] { CopyAllBut(rewrite, begin, end); }) || !Try([&] { rewrite.Claim(); }) ||
-        !Try([&] { rewrite.Replace(); })) {
-      return;
-    }
-    queue_.Close();
-    DeleteWhenEmpty();
-    log.Note(kInformation, "Transaction deleted from file.");
-    done = true;
-  });
-}
-
-// A line of the transaction is any that ends behind its begin and not beyond its end.
-void CsvOrderImporter::CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t begin, std::uint64_t end) {
-  rewrite.Begin();
-  LineReader& lines = queue_.Lines();
-  lines.Seek(1);
-  for (Line line; lines.Read(line);) {
-    if (line.End() <= begin || line.End() > end) rewrite.Keep(line);
-  }
-  rewrite.Finish();
-}
-
-void CsvOrderImporter::Cancel() {
-  Procedure("Sub Cancel", false, [&](bool&) {
-    queue_.Close();
-    Try([&] { backup_.Close(); });
-  });
+  bool read = false;
+  if (!Try([&] { read = queue_.Lines().Read(line); })) throw ErrorHandling::LeaveProcedure{};
+  return read;
 }
 
 void CsvOrderImporter::SetFields(std::string_view aLine, std::vector<std::string>& aFields) const {
-  DelimitedLine split(aFields.size());
+  DelimitedLine split(aFields.size(), values_.quotesProtectCommas);
   split.Split(aLine);
   for (std::size_t field = 0; field < aFields.size(); ++field) {
-    if (!split[field].empty()) aFields[field] = split[field];
+    if (split[field].data() != nullptr) aFields[field] = split[field];
   }
 }
 

@@ -1,0 +1,80 @@
+// Purchase orders of CML by way of the freight forwarder.
+#include "frame/dates.h"
+#include "orders/csv/csv_classes.h"
+
+namespace partnerkit::orders {
+
+namespace {
+
+using enum OrderField;
+
+constexpr OrderField kAdded[] = {INTDATE, RESPONSETYPECODE, DELIVERYPARTY, REQUIRED, TRADEDQUANTITY,
+                                 DELDATE, PROMODATE,        STATUS,        INNEREAN, INNERQTY};
+constexpr OrderField kRemoved[] = {CUSTCAT,           DEPTNO,         ADDATE, STOREZONE, UNITMEASURECODE, ORDERQUANTITY,
+                                   SKUPRODUCTKEYCODE, RETAILUNITPRICE};
+constexpr OrderField kOptional[] = {UNITMEASURECODE};
+constexpr OrderField kNumberFields[] = {PONUMBER, SHIPTOLOCPARTNERNO};
+
+constexpr std::size_t kShortNumber = 8;  // a longer order number is unique without its ship-to
+
+// clang-format off
+constexpr FieldText<Order> kHeader[] = {
+    {&Order::SupplierNo, SUPPLIERNO},
+    {&Order::Header2,    DELIVERYPARTY, false},
+};
+constexpr FieldText<OrderLine> kLine[] = {
+    {&OrderLine::LineNo,           SEQUENTIALLINENO, false},
+    {&OrderLine::ProductQualifier, PRODUCTQUALIFIER, false},
+    {&OrderLine::PriceCode,        UNITPRICECODE,    false},
+};
+constexpr FieldNumber<double> kLineNumbers[] = {
+    {&OrderLine::Cost, UNITPRICE},
+};
+// clang-format on
+
+constexpr CsvOrderValues kValues{
+    .className = "clsCMLFLFPOcsv",
+    .added = kAdded,
+    .removed = kRemoved,
+    .optional = kOptional,
+    .orderKey = kNumberFields,
+    .nullControls = true,
+    .endsAtOtherCompany = true,
+    .posting = {.storedOrder = kGtinStoredOrder,
+                .newOrder = kGtinNewOrder,
+                .headerTexts = kHeader,
+                .quantity = TRADEDQUANTITY,
+                .lineTexts = kLine,
+                .lineNumbers = kLineNumbers,
+                .checks = {.sameABN = true, .retail = false},
+                .checksBuyingLocn = false},
+    .keepsForeignLines = true,
+    .keepsTurnedAway = true,
+};
+
+}  // namespace
+
+clsCMLFLFPOcsv::clsCMLFLFPOcsv(const Ports& ports) : GtinOrderImporter(kValues, ports) {}
+
+std::string_view clsCMLFLFPOcsv::OrderNumber(std::string& number) const {
+  if ((*this)[PONUMBER].size() > kShortNumber) return (*this)[PONUMBER];
+  return number.assign((*this)[PONUMBER]).append(" #").append((*this)[SHIPTOLOCPARTNERNO]);
+}
+
+// What is ordered in cartons leaves on pallets.
+bool clsCMLFLFPOcsv::BeginPosting(Posting& posting) {
+  PackType pallet;
+  pallet.ShipPackCode = "PALLET";
+  if (Try([&] { return Find(Records(), PackType::kByShipPackCode, pallet); })) return true;
+  posting.log.Note(kWarning, words::kNoPallet.With(posting.entry.PONo));
+  return false;
+}
+
+void clsCMLFLFPOcsv::FillLine(Posting& posting, OrderLine& line) {
+  CsvOrderImporter::FillLine(posting, line);
+  const std::string_view uom = (*this)[UNITMEASURECODE];
+  line.UOM = std::string(uom.empty() ? "CT" : uom);
+  line.DeliveryDate = OrderDate((*this)[DELDATE]);
+}
+
+}  // namespace partnerkit::orders

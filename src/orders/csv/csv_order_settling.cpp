@@ -1,0 +1,160 @@
+// Settling a CSV order file: the rewrite without what is done, and the removal of one transaction.
+#include <algorithm>
+
+#include "orders/csv/csv_order_importer.h"
+
+namespace partnerkit::orders {
+
+namespace {
+
+constexpr OrderField kAddresses[] = {OrderField::PARTNEREDIADDR, OrderField::COMPANYEDIADDR};
+
+constexpr std::string_view kDeleteOnEmpty = "#%DELETEONEMPTY";
+
+// Segments of an interchange that some mailboxes leave between the lines.
+bool IsEnvelope(std::string_view line) {
+  constexpr std::string_view kTags[] = {"ISA", "GS*", "ST*", "IEA", "GE*", "SE*", "UNB", "UNH", "UNT", "UNZ"};
+  return std::ranges::find(kTags, line.substr(0, 3)) != std::end(kTags);
+}
+
+// Adds a line to the ranges; lines that follow each other make one range.
+void Extend(std::vector<ByteRange>& ranges, const Line& line) {
+  if (!ranges.empty() && ranges.back().end == line.position) {
+    ranges.back().end = line.End();
+  } else {
+    ranges.push_back({line.position, line.End()});
+  }
+}
+
+}  // namespace
+
+bool CsvOrderImporter::Term() {
+  return Procedure("Function Term", false, [&](bool& done) {
+    Try([&] { queue_.File(); });
+    // With nothing to take out, the file stays as it is.
+    if (!processed_.Empty() || values_.skipsBlankLines) {
+      // Nothing leaves the file before the store holds it for good.
+      Try([&] { Host().Commit(0); });
+      if (!SettleFile()) return;
+    }
+    queue_.Close();
+    Try([&] { backup_.Close(); });
+    DeleteWhenEmpty();
+    done = true;
+  });
+}
+
+// Rewrites the file without the orders dealt with; the lines of the posted ones go to the backup.
+bool CsvOrderImporter::SettleFile() {
+  WorkQueue::Rewrite rewrite(queue_);
+  std::vector<ByteRange> posted;
+  if (!Try([&] { DealOut(rewrite, posted); })) return false;
+  if (backup_.IsOpen() && !Try([&] { backup_.Append(queue_.File(), queue_.Path(), posted); })) return false;
+  if (!Try([&] { rewrite.Claim(); })) return false;
+  {
+    const HandlerOff off(Errors());
+    Try([&] { rewrite.Replace(); });
+  }
+  return Try([&] { backup_.Settle(); });
+}
+
+// Copies what stays to the temporary file and collects the posted ranges.
+void CsvOrderImporter::DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRange>& posted) {
+  rewrite.Begin();
+  posted.clear();
+  const std::size_t columns = std::max(line_.ColumnsFor(values_.orderKey), line_.ColumnsFor(kAddresses));
+  const std::size_t controls = values_.settlesByControls ? line_.ColumnsFor(values_.transactionKey) : 0;
+  std::string key, number, lastKey;
+  std::optional<std::int32_t> outcome = processed_.Find(lastKey);
+  LineReader& lines = queue_.Lines();
+  lines.Seek(1);
+  do {
+    for (Line line; lines.Read(line);) {
+      if (values_.skipsBlankLines && TrimBlanks(line.text).empty()) continue;
+      line_.Read(line.text, std::max(columns, controls));
+      SettledKey(key, number);
+      if (key != lastKey) {
+        lastKey = key;
+        outcome = processed_.Find(key);
+      }
+      if (!outcome || (values_.keepsForeignLines && !IsOurs())) {
+        rewrite.Keep(line);
+      } else if (*outcome > 0) {
+        Extend(posted, line);
+      }
+    }
+    rewrite.Finish();
+    // A mailbox that doesn't ask for the hold may have added lines meanwhile.
+  } while (queue_.File().Length() >= lines.Position());
+}
+
+// What the line's order is dealt with under.
+void CsvOrderImporter::SettledKey(std::string& key, std::string& number) const {
+  key = OrderNumber(number);
+  if (!values_.settlesByControls) return;
+  key += '\0';
+  for (const OrderField field : values_.transactionKey) key += line_[field];
+}
+
+void CsvOrderImporter::MarkProcessed(const ListedOrder& entry) {
+  std::string key = entry.PONo;
+  if (values_.settlesByControls) key.append(1, '\0').append(entry.Controls());
+  processed_.Add(key, entry.OrderId);
+}
+
+void CsvOrderImporter::DeleteWhenEmpty() {
+  const std::string_view options = Str(Document().Options);
+  if (values_.deleteOnEmptyAnywhere ? options.find(kDeleteOnEmpty) == std::string_view::npos
+                                    : options != kDeleteOnEmpty) {
+    return;
+  }
+  const HandlerOff off(Errors());
+  Try([&] {
+    if (FileSystem().Length(fileName_) == 0) FileSystem().Delete(fileName_);
+  });
+}
+
+bool CsvOrderImporter::Delete(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
+  return Procedure("Function Delete", false, [&](bool& done) {
+    CallLog log(*this, "Delete", vtErrorLog);
+    const ListedOrder* const entry = EntryOfRow(a_lRowNum);
+    if (entry == nullptr) return;
+    const auto begin = static_cast<std::uint64_t>(entry->FilePos);
+    std::uint64_t end = 0;
+    if (entry != &listed_.back()) {
+      end = static_cast<std::uint64_t>(entry[1].FilePos);
+    } else if (!Try([&] { end = queue_.File().Length() + 1; })) {
+      return;
+    }
+    WorkQueue::Rewrite rewrite(queue_);
+    if (!Try([&] { CopyAllBut(rewrite, begin, end); }) || !Try([&] { rewrite.Claim(); }) ||
+        !Try([&] { rewrite.Replace(); })) {
+      return;
+    }
+    queue_.Close();
+    DeleteWhenEmpty();
+    log.Note(kInformation, "Transaction deleted from file.");
+    done = true;
+  });
+}
+
+// A line of the transaction is any that ends behind its begin and not beyond its end.
+void CsvOrderImporter::CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t begin, std::uint64_t end) {
+  rewrite.Begin();
+  LineReader& lines = queue_.Lines();
+  lines.Seek(1);
+  for (Line line; lines.Read(line);) {
+    const bool inside = line.End() > begin && line.End() <= end;
+    if (!inside || (!values_.deletesEnvelopes && IsEnvelope(line.text))) rewrite.Keep(line);
+  }
+  rewrite.Finish();
+}
+
+void CsvOrderImporter::Cancel() {
+  Procedure("Sub Cancel", false, [&](bool&) {
+    queue_.Close();
+    Try([&] { backup_.Close(); });
+  });
+}
+
+}  // namespace partnerkit::orders

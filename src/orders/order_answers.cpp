@@ -1,0 +1,40 @@
+#include "orders/order_answers.h"
+
+#include <algorithm>
+#include <cctype>
+#include <string_view>
+
+namespace partnerkit::orders {
+
+namespace {
+
+bool IsAcknowledgement(std::string_view documentCode) {
+  if (documentCode == "855" || documentCode == "ORDRSP") return true;
+  std::string upper(documentCode);
+  std::ranges::transform(upper, upper.begin(), [](unsigned char c) { return static_cast<char>(std::toupper(c)); });
+  return upper == "POA" || upper == "SO";
+}
+
+}  // namespace
+
+bool HasOrderAcknowledgement(TranslatorBase& translator) {
+  const EDIDoc& own = translator.Document();
+  const auto documents = translator.Try([&] { return translator.Host().EDIDocList(); });
+  return std::ranges::any_of(documents, [&](const EDIDoc& other) {
+    return other.PartnerId == own.PartnerId && other.VendorId == own.VendorId && IsAcknowledgement(other.DocumentCode);
+  });
+}
+
+bool IsPackedBy(TranslatorBase& translator, const std::string& productNo, double quantity) {
+  RecordStore& store = translator.Records();
+  ProductInner inner;
+  inner.ProductNo = productNo;
+  inner.InnerQty = quantity;
+  if (translator.Try([&] { return Count(store, ProductInner::kByQuantity, inner); }) > 0) return true;
+  Prepack prepack;
+  prepack.ProductNo = productNo;
+  prepack.PrepackQty = quantity;
+  return translator.Try([&] { return Load(store, prepack); });
+}
+
+}  // namespace partnerkit::orders
