@@ -13,8 +13,8 @@ namespace {
 
 constexpr std::string_view kVersionTable = "tbSchemaVersion";
 
-// An import writes these row by row, and each index of theirs is paid for with every row. A look-up that names more than
-// the owner filters the owner's few rows.
+// An import writes these row by row, and each index of theirs is paid for with every row. A look-up that names more
+// than the owner filters the owner's few rows.
 constexpr std::array<std::string_view, 4> kBulkTables = {"tbOrder", "tbOrderLine", "tbOrderLocn", "tbOrderLocnLine"};
 
 // Lines and the like go with their owner, so nothing is left to take a later one for them.
@@ -30,14 +30,20 @@ std::string ColumnType(const Dialect& dialect, const RecordType& type, const Mem
            " BETWEEN 1 AND 2147483647)";
   }
   switch (member.kind) {
-    case MemberKind::kString: return text(dialect.textColumn, " NOT NULL DEFAULT ''");
+    case MemberKind::kString:
+      return text(dialect.textColumn, " NOT NULL DEFAULT ''");
     case MemberKind::kText:
-    case MemberKind::kDate: return text(dialect.textColumn, "");
+    case MemberKind::kDate:
+      return text(dialect.textColumn, "");
     case MemberKind::kInt:
-    case MemberKind::kBool: return text(dialect.intColumn, " NOT NULL DEFAULT 0");
-    case MemberKind::kLong: return text(dialect.longColumn, " NOT NULL DEFAULT 0");
-    case MemberKind::kDouble: return text(dialect.realColumn, " NOT NULL DEFAULT 0");
-    case MemberKind::kNumber: return text(dialect.realColumn, "");
+    case MemberKind::kBool:
+      return text(dialect.intColumn, " NOT NULL DEFAULT 0");
+    case MemberKind::kLong:
+      return text(dialect.longColumn, " NOT NULL DEFAULT 0");
+    case MemberKind::kDouble:
+      return text(dialect.realColumn, " NOT NULL DEFAULT 0");
+    case MemberKind::kNumber:
+      return text(dialect.realColumn, "");
   }
   return {};
 }
@@ -111,8 +117,8 @@ std::optional<std::int32_t> StoredVersion(SqlSession& session) {
 bool IsUpToDate(SqlSession& session, std::int32_t version) {
   const std::optional<std::int32_t> stored = StoredVersion(session);
   if (stored.value_or(0) > version) {
-    session.Raise("is of a newer version (" + std::to_string(*stored) + ") than this program (" + std::to_string(version) +
-                  ") understands");
+    session.Raise("is of a newer version (" + std::to_string(*stored) + ") than this program (" +
+                  std::to_string(version) + ") understands");
   }
   return stored == version;
 }
@@ -134,8 +140,8 @@ void BringUpToDate(SqlSession& session, std::span<const RecordType* const> types
     for (const std::string& index : CreateIndexSql(*type)) session.Execute(index);
   }
   const std::string text(session.Sql().textColumn);
-  session.Execute("CREATE TABLE IF NOT EXISTS " + Quoted(kSettingsTable) + "(\"Name\" " + text + " PRIMARY KEY,\"Value\" " +
-                  text + " NOT NULL)");
+  session.Execute("CREATE TABLE IF NOT EXISTS " + Quoted(kSettingsTable) + "(\"Name\" " + text +
+                  " PRIMARY KEY,\"Value\" " + text + " NOT NULL)");
   session.Execute("CREATE TABLE IF NOT EXISTS " + Quoted(kVersionTable) + "(\"Version\" INTEGER NOT NULL)");
   session.Execute("DELETE FROM " + Quoted(kVersionTable));
   session.Execute("INSERT INTO " + Quoted(kVersionTable) + " VALUES(" + std::to_string(version) + ")");
@@ -156,7 +162,8 @@ std::vector<std::string> CreateIndexSql(const RecordType& type) {
   std::vector<std::string> statements;
   for (const Index& index : IndexesOf(type)) {
     std::string columns;
-    for (const std::string_view column : index.columns) columns.append(columns.empty() ? "" : ",").append(Quoted(column));
+    for (const std::string_view column : index.columns)
+      columns.append(columns.empty() ? "" : ",").append(Quoted(column));
     statements.push_back(std::string("CREATE ") + (index.unique ? "UNIQUE " : "") + "INDEX IF NOT EXISTS " +
                          Quoted(index.name) + " ON " + Quoted(type.table) + "(" + columns + ")");
   }

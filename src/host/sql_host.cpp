@@ -16,9 +16,12 @@ namespace {
 
 std::string_view ColumnOf(Counter counter) {
   switch (counter) {
-    case Counter::kASNNo: return "LastASNNo";
-    case Counter::kInterchangeNo: return "LastInterchangeNo";
-    case Counter::kGroupNo: return "LastGroupNo";
+    case Counter::kASNNo:
+      return "LastASNNo";
+    case Counter::kInterchangeNo:
+      return "LastInterchangeNo";
+    case Counter::kGroupNo:
+      return "LastGroupNo";
   }
   return {};
 }
@@ -96,8 +99,11 @@ bool SqlHost::DeleteOrder(const Order& order) {
     done = Delete(store, order) && store.DeleteAll(OrderLocnLine::kType, OrderLocnLine::kByOrder, &locnLine) &&
            store.DeleteAll(OrderLocn::kType, OrderLocn::kByOrder, &locn) &&
            store.DeleteAll(OrderLine::kType, OrderLine::kByOrder, &line);
-    if (!done) session.Execute("ROLLBACK TO \"DeleteOrder\"");
-    session.Execute("RELEASE \"DeleteOrder\"");
+    // A failure that took the whole transaction back took the savepoint along.
+    if (session.InTransaction()) {
+      if (!done) session.Execute("ROLLBACK TO \"DeleteOrder\"");
+      session.Execute("RELEASE \"DeleteOrder\"");
+    }
   } catch (const soci::soci_error& error) {
     session.Failed(error);
     done = false;
@@ -129,8 +135,8 @@ std::int32_t SqlHost::NextNumber(std::string_view partnerId, Counter counter) {
       last.Reset();
       if (!found) session.Raise("there is no partner \"" + std::string(partnerId) + "\"");
       if (next > std::numeric_limits<std::int32_t>::max()) {
-        throw RunTimeError(run_time::kOverflow, session.Name() + ": partner " + std::string(partnerId) + " has used up its " +
-                                                    std::string(ColumnOf(counter)));
+        throw RunTimeError(run_time::kOverflow, session.Name() + ": partner " + std::string(partnerId) +
+                                                    " has used up its " + std::string(ColumnOf(counter)));
       }
       Statement& move = parts_->Prepared("UPDATE " + table + " SET " + column + "=:p0 WHERE \"PartnerId\"=:p1",
                                          {MemberKind::kLong, MemberKind::kString}, {});
@@ -162,9 +168,10 @@ std::optional<std::string> SqlHost::Setting(std::string_view name) {
 std::vector<std::pair<std::string, std::string>> SqlHost::Settings() {
   return parts_->session.Guarded([&] {
     std::vector<std::pair<std::string, std::string>> settings;
-    Statement& all = parts_->Prepared("SELECT \"Name\",\"Value\" FROM " + Quoted(kSettingsTable) + " ORDER BY \"Name\"", {},
-                                      {MemberKind::kString, MemberKind::kString});
-    for (bool more = all.Execute(); more; more = all.Next()) settings.emplace_back(all.Column(0).text, all.Column(1).text);
+    Statement& all = parts_->Prepared("SELECT \"Name\",\"Value\" FROM " + Quoted(kSettingsTable) + " ORDER BY \"Name\"",
+                                      {}, {MemberKind::kString, MemberKind::kString});
+    for (bool more = all.Execute(); more; more = all.Next())
+      settings.emplace_back(all.Column(0).text, all.Column(1).text);
     return settings;
   });
 }
@@ -179,7 +186,8 @@ void SqlHost::SetSetting(std::string_view name, std::string_view value) {
     update.Parameter(1).Set(name);
     update.Execute();
     if (update.RowsChanged() > 0) return;
-    Statement& add = parts_->Prepared("INSERT INTO " + Quoted(kSettingsTable) + "(\"Value\",\"Name\") VALUES(:p0,:p1)", both, {});
+    Statement& add =
+        parts_->Prepared("INSERT INTO " + Quoted(kSettingsTable) + "(\"Value\",\"Name\") VALUES(:p0,:p1)", both, {});
     add.Parameter(0).Set(value);
     add.Parameter(1).Set(name);
     add.Execute();

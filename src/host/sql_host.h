@@ -16,14 +16,14 @@
 
 namespace partnerkit::host {
 
-// SQLite guards each of its calls against other threads, which takes an eighth of the time of an import. A program none of
-// whose SQLite connections is shared between threads may do without; to be called before it opens the first. False when
-// that has happened already, and all stays as it is.
+// SQLite guards each of its calls against other threads, which takes a twelfth of the computing of an import. A program
+// none of whose SQLite connections is shared between threads may do without; to be called before it opens the first.
+// False when that has happened already, and all stays as it is.
 bool DropThreadGuards();
 
-// Changes are grouped as SqlSession tells: `Commit` makes them durable, and so do `Close` and the destructor, since what a
-// failed posting leaves behind is kept for the next run to find. Only a killed program loses what it did not commit.
-// While changes wait for their commit, other programs on the same database wait too.
+// Changes are grouped as SqlSession tells: `Commit` makes them durable, and so do `Close` and the destructor, since
+// what a failed posting leaves behind is kept for the next run to find. Only a killed program loses what it did not
+// commit. While changes wait for their commit, other programs on the same database wait too.
 class SqlHost : public System {
  public:
   // Opens the database and makes or updates its tables. `url` is a file path, with or without "sqlite3://" before it.

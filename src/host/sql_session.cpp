@@ -51,7 +51,8 @@ void CheckFile(const std::string& file, bool create) {
   if (!create && status.type() == std::filesystem::file_type::not_found) Refuse(file, "there is no such database");
 }
 
-// SOCI's connection text is a list of name=value; a path with a "=" has to be quoted, and only then may it not hold a quote.
+// SOCI's connection text is a list of name=value; a path with a "=" has to be quoted, and only then may it not hold a
+// quote.
 std::string ConnectionText(std::string file) {
   // "file:x" is a URI to SQLite, and only a path here.
   if (file.starts_with("file:")) file.insert(0, "./");
@@ -176,7 +177,8 @@ void SqlSession::Begin() {
 }
 
 void SqlSession::CommitExplicit() {
-  if (state_ != State::kExplicit) Raise(loss_.empty() ? "no transaction is open" : "the transaction was taken back: " + loss_);
+  if (state_ != State::kExplicit)
+    Raise(loss_.empty() ? "no transaction is open" : "the transaction was taken back: " + loss_);
   if (!loss_.empty()) TellLoss();
   CommitOpen();
 }
@@ -186,6 +188,8 @@ void SqlSession::RollbackExplicit() {
   RollBackOpen();
   loss_.clear();
 }
+
+bool SqlSession::InTransaction() { return sqlite_api::sqlite3_get_autocommit(Connection()) == 0; }
 
 void SqlSession::Close() {
   RollbackExplicit();
@@ -207,7 +211,7 @@ void SqlSession::CommitOpen() {
 
 void SqlSession::RollBackOpen() noexcept {
   state_ = State::kNone;
-  if (sqlite_api::sqlite3_get_autocommit(Connection()) != 0) return;
+  if (!InTransaction()) return;
   try {
     Run(rollback_, "ROLLBACK");
   } catch (const soci::soci_error&) {
@@ -236,7 +240,7 @@ void SqlSession::TellLoss() {
 void SqlSession::Failed(const soci::soci_error& error) {
   const int code = sqlite_api::sqlite3_extended_errcode(Connection());
   nativeError_ = code == SQLITE_OK ? SQLITE_ERROR : code;
-  if (state_ == State::kNone || sqlite_api::sqlite3_get_autocommit(Connection()) == 0) return;
+  if (state_ == State::kNone || InTransaction()) return;
   NoteLoss(MessageOf(error));
   if (state_ == State::kImplicit) state_ = State::kNone;
 }
@@ -257,8 +261,8 @@ void SqlSession::Raise(const soci::soci_error& error) {
 
 void SqlSession::Raise(std::string_view message) const { Refuse(name_, message); }
 
-// SQLite's lock has no queue: a program that begins again right after its commit keeps the others polling until they give up.
-// A rest that is longer than their poll lets the next one in.
+// SQLite's lock has no queue: a program that begins again right after its commit keeps the others polling until they
+// give up. A rest that is longer than their poll lets the next one in.
 void SqlSession::GiveTurn() {
   if (steady_clock::now() - lastTurn_ < kTurnEvery) return;
   std::this_thread::sleep_for(kTurn);

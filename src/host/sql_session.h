@@ -28,12 +28,12 @@ struct Dialect {
 // A name inside a statement: "OrderId".
 std::string Quoted(std::string_view identifier);
 
-// Changes gather in an implicit transaction, which the first one opens and `Commit` makes durable; `Begin` opens an explicit
-// one. Reading opens neither.
+// Changes gather in an implicit transaction, which the first one opens and `Commit` makes durable; `Begin` opens an
+// explicit one. Reading opens neither.
 //
-// A full disk or a failing device makes SQLite take back the whole transaction by itself. What was stored since the last
-// commit is then lost, and every `Commit` says so until the next change or `Begin` opens a new transaction: a caller that commits
-// again must not take the second call's success for the first one's.
+// A full disk or a failing device makes SQLite take back the whole transaction by itself. What was stored since the
+// last commit is then lost, and every `Commit` says so until the next change or `Begin` opens a new transaction: a
+// caller that commits again must not take the second call's success for the first one's.
 class SqlSession {
  public:
   // `url` is a file path, with or without "sqlite3://" before it. Raises RunTimeError.
@@ -65,7 +65,8 @@ class SqlSession {
   void RollbackExplicit();
   // Commits the implicit transaction, takes back an explicit one.
   void Close();
-  bool InExplicit() const { return state_ == State::kExplicit; }
+  // As the database sees it: false, too, when it has taken the open one back.
+  bool InTransaction();
 
   // The newest failure's number, 0 after a success.
   std::int32_t NativeError() const { return nativeError_; }

@@ -69,19 +69,30 @@ SqlStore::SqlStore(SqlSession& session) : session_(session) {}
 
 SqlStore::~SqlStore() = default;
 
-std::unique_ptr<SqlStore::Prepared> SqlStore::Prepare(const RecordType& type, Operation operation, const Lookup* lookup) {
+std::unique_ptr<SqlStore::Prepared> SqlStore::Prepare(const RecordType& type, Operation operation,
+                                                      const Lookup* lookup) {
   const auto text = [&]() -> TableSql {
     switch (operation) {
-      case Operation::kAdd: return InsertSql(session_.Sql(), type, false);
-      case Operation::kAddWithId: return InsertSql(session_.Sql(), type, true);
-      case Operation::kLoad: return LoadSql(type);
-      case Operation::kUpdate: return UpdateSql(type);
-      case Operation::kDelete: return DeleteSql(type);
-      case Operation::kFind: return SelectSql(type, *lookup, true);
-      case Operation::kSelect: return SelectSql(type, *lookup, false);
-      case Operation::kCount: return CountSql(type, *lookup);
-      case Operation::kDeleteAll: return DeleteAllSql(type, *lookup);
-      case Operation::kAll: return AllSql(type);
+      case Operation::kAdd:
+        return InsertSql(session_.Sql(), type, false);
+      case Operation::kAddWithId:
+        return InsertSql(session_.Sql(), type, true);
+      case Operation::kLoad:
+        return LoadSql(type);
+      case Operation::kUpdate:
+        return UpdateSql(type);
+      case Operation::kDelete:
+        return DeleteSql(type);
+      case Operation::kFind:
+        return SelectSql(type, *lookup, true);
+      case Operation::kSelect:
+        return SelectSql(type, *lookup, false);
+      case Operation::kCount:
+        return CountSql(type, *lookup);
+      case Operation::kDeleteAll:
+        return DeleteAllSql(type, *lookup);
+      case Operation::kAll:
+        return AllSql(type);
     }
     return {};
   };

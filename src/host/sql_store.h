@@ -14,8 +14,8 @@ namespace partnerkit::host {
 
 class SqlSession;
 
-// Each statement is prepared at its first use and kept for the life of the store, so record types and look-ups have to be
-// constants. A change that finds no transaction open opens one; see SqlSession.
+// Each statement is prepared at its first use and kept for the life of the store, so record types and look-ups have to
+// be constants. A change that finds no transaction open opens one; see SqlSession.
 class SqlStore : public RecordStore {
  public:
   explicit SqlStore(SqlSession& session);
@@ -33,8 +33,8 @@ class SqlStore : public RecordStore {
   std::int32_t Count(const RecordType& type, const Lookup& lookup, const void* probe) override;
   std::int32_t NativeError() const override;
 
-  // Writes the record over the stored one of the same id or key, or stores it as a new one; one with an id of 0 is always
-  // new. False when the store refuses.
+  // Writes the record over the stored one of the same id or key, or stores it as a new one; one with an id of 0 is
+  // always new. False when the store refuses.
   bool ReplaceOrAdd(const RecordType& type, void* record);
   // Reads every record of the type into `record`, by id or key, and calls `visit` after each. Raises RunTimeError.
   void ForEach(const RecordType& type, void* record, const std::function<void()>& visit);
@@ -42,7 +42,18 @@ class SqlStore : public RecordStore {
   bool DeleteAll(const RecordType& type, const Lookup& lookup, const void* probe);
 
  private:
-  enum class Operation : std::uint8_t { kAdd, kAddWithId, kLoad, kUpdate, kDelete, kFind, kSelect, kCount, kAll, kDeleteAll };
+  enum class Operation : std::uint8_t {
+    kAdd,
+    kAddWithId,
+    kLoad,
+    kUpdate,
+    kDelete,
+    kFind,
+    kSelect,
+    kCount,
+    kAll,
+    kDeleteAll
+  };
   struct Key {
     const void* type;
     const void* lookup;

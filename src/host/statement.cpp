@@ -18,18 +18,25 @@ void WithValue(Cell& cell, F&& bind) {
   switch (cell.kind) {
     case MemberKind::kInt:
     case MemberKind::kLong:
-    case MemberKind::kBool: return bind(cell.whole);
+    case MemberKind::kBool:
+      return bind(cell.whole);
     case MemberKind::kDouble:
-    case MemberKind::kNumber: return bind(cell.real);
-    default: return bind(cell.text);
+    case MemberKind::kNumber:
+      return bind(cell.real);
+    default:
+      return bind(cell.text);
   }
 }
 
 template <class T>
-const T& As(const void* value) { return *static_cast<const T*>(value); }
+const T& As(const void* value) {
+  return *static_cast<const T*>(value);
+}
 
 template <class T>
-T& As(void* value) { return *static_cast<T*>(value); }
+T& As(void* value) {
+  return *static_cast<T*>(value);
+}
 
 }  // namespace
 
@@ -46,14 +53,24 @@ void Cell::Set(std::int64_t value) {
 void Cell::CopyFrom(const void* value) {
   bool present = true;
   switch (kind) {
-    case MemberKind::kString: text = As<std::string>(value); break;
+    case MemberKind::kString:
+      text = As<std::string>(value);
+      break;
     case MemberKind::kText:
       if ((present = As<Text>(value).has_value())) text = *As<Text>(value);
       break;
-    case MemberKind::kInt: whole = As<std::int32_t>(value); break;
-    case MemberKind::kLong: whole = As<std::int64_t>(value); break;
-    case MemberKind::kBool: whole = As<bool>(value) ? 1 : 0; break;
-    case MemberKind::kDouble: real = As<double>(value); break;
+    case MemberKind::kInt:
+      whole = As<std::int32_t>(value);
+      break;
+    case MemberKind::kLong:
+      whole = As<std::int64_t>(value);
+      break;
+    case MemberKind::kBool:
+      whole = As<bool>(value) ? 1 : 0;
+      break;
+    case MemberKind::kDouble:
+      real = As<double>(value);
+      break;
     case MemberKind::kNumber:
       if ((present = As<std::optional<double>>(value).has_value())) real = *As<std::optional<double>>(value);
       break;
@@ -67,14 +84,30 @@ void Cell::CopyFrom(const void* value) {
 void Cell::CopyTo(void* value) const {
   const bool null = IsNull();
   switch (kind) {
-    case MemberKind::kString: As<std::string>(value).assign(null ? std::string_view() : std::string_view(text)); break;
-    case MemberKind::kText: As<Text>(value) = null ? Text() : Text(text); break;
-    case MemberKind::kInt: As<std::int32_t>(value) = null ? 0 : static_cast<std::int32_t>(whole); break;
-    case MemberKind::kLong: As<std::int64_t>(value) = null ? 0 : whole; break;
-    case MemberKind::kBool: As<bool>(value) = !null && whole != 0; break;
-    case MemberKind::kDouble: As<double>(value) = null ? 0 : real; break;
-    case MemberKind::kNumber: As<std::optional<double>>(value) = null ? std::nullopt : std::optional(real); break;
-    case MemberKind::kDate: As<std::optional<DateTime>>(value) = null ? std::nullopt : DateTime::FromIso(text); break;
+    case MemberKind::kString:
+      As<std::string>(value).assign(null ? std::string_view() : std::string_view(text));
+      break;
+    case MemberKind::kText:
+      As<Text>(value) = null ? Text() : Text(text);
+      break;
+    case MemberKind::kInt:
+      As<std::int32_t>(value) = null ? 0 : static_cast<std::int32_t>(whole);
+      break;
+    case MemberKind::kLong:
+      As<std::int64_t>(value) = null ? 0 : whole;
+      break;
+    case MemberKind::kBool:
+      As<bool>(value) = !null && whole != 0;
+      break;
+    case MemberKind::kDouble:
+      As<double>(value) = null ? 0 : real;
+      break;
+    case MemberKind::kNumber:
+      As<std::optional<double>>(value) = null ? std::nullopt : std::optional(real);
+      break;
+    case MemberKind::kDate:
+      As<std::optional<DateTime>>(value) = null ? std::nullopt : DateTime::FromIso(text);
+      break;
   }
 }
 

@@ -11,7 +11,8 @@
 
 namespace partnerkit::host {
 
-// One value on its way in or out. Its address is bound once and its text keeps its room, so that a row costs no allocation.
+// One value on its way in or out. Its address is bound once and its text keeps its room, so that a row costs no
+// allocation.
 struct Cell {
   MemberKind kind = MemberKind::kString;
   soci::indicator state = soci::i_ok;
@@ -22,8 +23,8 @@ struct Cell {
   void Set(std::string_view value);
   void Set(std::int64_t value);
   bool IsNull() const { return state == soci::i_null; }
-  // Copies from and to a member's own memory, which is of the cell's kind. A null read into a member that has no null gives
-  // its zero.
+  // Copies from and to a member's own memory, which is of the cell's kind. A null read into a member that has no null
+  // gives its zero.
   void CopyFrom(const void* value);
   void CopyTo(void* value) const;
 };

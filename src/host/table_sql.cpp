@@ -96,7 +96,8 @@ Members KeysOf(const RecordType& type) {
 
 std::int64_t IdValue(const Member& id, const void* record) {
   const void* value = id.at(const_cast<void*>(record));
-  return id.kind == MemberKind::kLong ? *static_cast<const std::int64_t*>(value) : *static_cast<const std::int32_t*>(value);
+  return id.kind == MemberKind::kLong ? *static_cast<const std::int64_t*>(value)
+                                      : *static_cast<const std::int32_t*>(value);
 }
 
 void SetIdValue(const Member& id, void* record, std::int64_t value) {
@@ -110,7 +111,8 @@ TableSql InsertSql(const Dialect& dialect, const RecordType& type, bool withId) 
   const Member* id = IdOf(type);
   if (!withId) std::erase(stored, id);
   insert.sql = "INSERT INTO " + Quoted(type.table) + "(" + List(stored) + ") VALUES(";
-  for (const Member* member : stored) insert.sql.append(member == stored.front() ? "" : ",").append(Take(insert, *member));
+  for (const Member* member : stored)
+    insert.sql.append(member == stored.front() ? "" : ",").append(Take(insert, *member));
   insert.sql += ')';
   if (id != nullptr && !withId && dialect.returnsId) {
     insert.sql += " RETURNING " + Quoted(id->name);
@@ -128,8 +130,10 @@ TableSql UpdateSql(const RecordType& type) {
   TableSql update{"UPDATE " + Quoted(type.table) + " SET ", {}, {}};
   const Members identity = IdentityOf(type);
   Members set = AllOf(type);
-  // The identity is written only where there is nothing else to write: the statement has to tell whether the record exists.
-  if (set.size() > identity.size()) std::erase_if(set, [&](auto* m) { return std::ranges::find(identity, m) != identity.end(); });
+  // The identity is written only where there is nothing else to write: the statement has to tell whether the record
+  // exists.
+  if (set.size() > identity.size())
+    std::erase_if(set, [&](auto* m) { return std::ranges::find(identity, m) != identity.end(); });
   for (const Member* member : set) {
     if (member != set.front()) update.sql += ',';
     SetMember(update, type, *member);

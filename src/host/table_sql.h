@@ -31,8 +31,8 @@ inline constexpr std::string_view kRowColumn = "RowNo";
 
 TableSql InsertSql(const Dialect& dialect, const RecordType& type, bool withId);
 TableSql LoadSql(const RecordType& type);
-// By id when the type has one, else by key. A partner's counters only ever go up: a record that was read before the newest
-// number was drawn must not bring that number back.
+// By id when the type has one, else by key. A partner's counters only ever go up: a record that was read before the
+// newest number was drawn must not bring that number back.
 TableSql UpdateSql(const RecordType& type);
 TableSql DeleteSql(const RecordType& type);
 // The records that fit the look-up, in the order added; only the first with `one`.
