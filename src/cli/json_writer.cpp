@@ -1,0 +1,132 @@
+#include "cli/json_writer.h"
+
+#include <cmath>
+#include <string>
+
+#include "cli/text.h"
+
+namespace partnerkit::cli {
+
+namespace {
+
+// Deeper levels stand on one line: a record, a row.
+constexpr std::size_t kLevelsOverLines = 2;
+
+}  // namespace
+
+JsonWriter::~JsonWriter() {
+  while (!levels_.empty()) {
+    if (named_) Null();
+    End();
+  }
+}
+
+void JsonWriter::Begin(char open) {
+  Separate();
+  out_ << open;
+  levels_.push_back({open == '{' ? '}' : ']', true});
+}
+
+void JsonWriter::End() {
+  const Level level = levels_.back();
+  if (levels_.size() <= kLevelsOverLines && !level.empty) {
+    levels_.pop_back();
+    BreakLine();
+  } else {
+    levels_.pop_back();
+  }
+  out_ << level.close;
+  if (levels_.empty()) out_ << '\n';
+}
+
+void JsonWriter::BreakLine() { out_ << '\n' << std::string(levels_.size() * 2, ' '); }
+
+void JsonWriter::Separate() {
+  if (named_) {
+    named_ = false;
+    return;
+  }
+  if (levels_.empty()) return;
+  const bool first = levels_.back().empty;
+  levels_.back().empty = false;
+  if (!first) out_ << ',';
+  if (levels_.size() <= kLevelsOverLines) {
+    BreakLine();
+  } else if (!first) {
+    out_ << ' ';
+  }
+}
+
+void JsonWriter::Name(std::string_view name) {
+  Separate();
+  Quote(name);
+  out_ << ": ";
+  named_ = true;
+}
+
+void JsonWriter::Literal(std::string_view json) {
+  Separate();
+  out_ << json;
+}
+
+void JsonWriter::Int(std::int64_t value) { Literal(std::to_string(value)); }
+
+void JsonWriter::Number(double value) {
+  if (std::isfinite(value)) {
+    Literal(ShortestNumber(value));
+  } else {
+    Null();
+  }
+}
+
+void JsonWriter::String(std::string_view bytes) {
+  Separate();
+  Quote(bytes);
+}
+
+void JsonWriter::Quote(std::string_view bytes) {
+  constexpr std::string_view kHex = "0123456789abcdef";
+  std::string quoted = "\"";
+  for (const char c : Utf8(bytes)) {
+    switch (c) {
+      case '"':
+        quoted += "\\\"";
+        break;
+      case '\\':
+        quoted += "\\\\";
+        break;
+      case '\n':
+        quoted += "\\n";
+        break;
+      case '\r':
+        quoted += "\\r";
+        break;
+      case '\t':
+        quoted += "\\t";
+        break;
+      default:
+        if (static_cast<unsigned char>(c) < ' ') {
+          quoted += "\\u00";
+          quoted += kHex[static_cast<unsigned char>(c) >> 4];
+          quoted += kHex[static_cast<unsigned char>(c) & 15];
+        } else {
+          quoted += c;
+        }
+    }
+  }
+  out_ << quoted << '"';
+}
+
+void JsonWriter::Value(const Cell& cell) {
+  struct Writer {
+    JsonWriter& json;
+    void operator()(std::monostate) const { json.Null(); }
+    void operator()(bool value) const { json.Bool(value); }
+    void operator()(double value) const { json.Number(value); }
+    void operator()(const std::string& value) const { json.String(value); }
+    void operator()(const DateTime& value) const { json.Date(value); }
+  };
+  std::visit(Writer{*this}, cell);
+}
+
+}  // namespace partnerkit::cli

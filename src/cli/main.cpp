@@ -1,0 +1,11 @@
+#include <csignal>
+#include <iostream>
+
+#include "cli/program.h"
+
+int main(int count, char** arguments) {
+  // A reader that goes away (`| head`) is an output that fails, not a reason to die half way.
+  std::signal(SIGPIPE, SIG_IGN);
+  std::ios::sync_with_stdio(false);
+  return partnerkit::cli::RunProgram({arguments + 1, arguments + count}, std::cout, std::cerr);
+}

@@ -1,0 +1,34 @@
+// What a run on a file has to show.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <variant>
+#include <vector>
+
+#include "cli/command.h"
+#include "partnerkit/store.h"
+#include "partnerkit/values.h"
+
+namespace partnerkit::cli {
+
+enum class Outcome { kPosted, kCancelled, kDeleted, kTurnedAway };
+
+struct RowResult {
+  std::int64_t row;
+  std::variant<std::int32_t, bool> result;  // of `Process`, of `Delete`
+  ErrorList errorLog;
+  Outcome outcome = Outcome::kTurnedAway;
+};
+
+struct RunReport {
+  ColumnTable columns;
+  RowTable rows;
+  bool withResults = false;
+  std::vector<RowResult> results;
+  std::vector<std::int32_t> logIds;  // every log record of the run
+};
+
+void PrintRun(const Command& command, const RunReport& report, RecordStore& store);
+
+}  // namespace partnerkit::cli

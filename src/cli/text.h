@@ -1,0 +1,23 @@
+// Text as the command line shows it. The store holds bytes as partners sent them.
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+
+namespace partnerkit::cli {
+
+// The text as UTF-8: bytes that aren't are read as Windows-1252, which is what partners' older programs write.
+std::string Utf8(std::string_view bytes);
+
+// The text as UTF-8 on one line that a terminal may be sent: each run of blanks and line ends is one blank, any other
+// control character a "?".
+std::string OneLine(std::string_view bytes);
+
+// Characters of a UTF-8 text, which are its columns on a terminal.
+std::size_t Width(std::string_view utf8);
+
+// The shortest text that reads back as the same number: "10.5", "6", "1e+308".
+std::string ShortestNumber(double number);
+
+}  // namespace partnerkit::cli

@@ -1,0 +1,57 @@
+// The host of a run, watched from the command line: which log records the run writes, and whether it took an order
+// away.
+#pragma once
+
+#include <cstdint>
+#include <vector>
+
+#include "host/sql_host.h"
+#include "partnerkit/records.h"
+
+namespace partnerkit::cli {
+
+class WatchedHost : public System, private RecordStore {
+ public:
+  explicit WatchedHost(host::SqlHost& host) : host_(host), records_(host.Records()) {}
+
+  // Ids of the log records written so far; programs that share the store write theirs in between.
+  const std::vector<std::int32_t>& LogIds() const { return logIds_; }
+  // How many orders the store gave up.
+  std::int32_t OrdersDeleted() const { return ordersDeleted_; }
+
+  RecordStore& Records() override { return *this; }
+  std::string UserId() override { return host_.UserId(); }
+  bool DeleteOrder(const Order& order) override;
+  void Commit(std::int32_t mode) override { host_.Commit(mode); }
+  void BeginTrans() override { host_.BeginTrans(); }
+  void CommitTrans() override { host_.CommitTrans(); }
+  void RollbackTrans() override { host_.RollbackTrans(); }
+  std::vector<EDIDoc> EDIDocList() override { return host_.EDIDocList(); }
+  std::int32_t NextNumber(std::string_view partnerId, Counter counter) override {
+    return host_.NextNumber(partnerId, counter);
+  }
+
+ private:
+  bool Load(const RecordType& type, void* record) override { return records_.Load(type, record); }
+  bool Add(const RecordType& type, void* record) override;
+  bool Update(const RecordType& type, const void* record) override { return records_.Update(type, record); }
+  bool Delete(const RecordType& type, const void* record) override { return records_.Delete(type, record); }
+  bool Find(const RecordType& type, const Lookup& lookup, void* record) override {
+    return records_.Find(type, lookup, record);
+  }
+  void Select(const RecordType& type, const Lookup& lookup, const void* probe,
+              const std::function<void*()>& next) override {
+    records_.Select(type, lookup, probe, next);
+  }
+  std::int32_t Count(const RecordType& type, const Lookup& lookup, const void* probe) override {
+    return records_.Count(type, lookup, probe);
+  }
+  std::int32_t NativeError() const override { return records_.NativeError(); }
+
+  host::SqlHost& host_;
+  RecordStore& records_;
+  std::vector<std::int32_t> logIds_;
+  std::int32_t ordersDeleted_ = 0;
+};
+
+}  // namespace partnerkit::cli

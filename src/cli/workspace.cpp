@@ -1,0 +1,116 @@
+#include "cli/workspace.h"
+
+#include <cstdlib>
+#include <vector>
+
+#include "cli/text.h"
+#include "partnerkit/platform.h"
+#include "partnerkit/run_time_error.h"
+
+namespace partnerkit::cli {
+
+namespace fs = std::filesystem;
+
+namespace {
+
+// maps: column-name maps. inbox: what partners sent. backup: lines of posted orders. spool: print jobs.
+constexpr std::string_view kFolders[] = {"maps", "inbox", "backup", "spool"};
+
+fs::path ChosenFolder(const Options& options) {
+  if (!options.workspace.empty()) return AbsolutePath(options.workspace);
+  const char* named = std::getenv("PARTNERKIT_WORKSPACE");
+  return AbsolutePath(named != nullptr && *named != '\0' ? named : ".");
+}
+
+std::unique_ptr<host::SqlHost> OpenStore(const std::string& url, bool create) {
+  try {
+    host::SqlOptions options;
+    options.create = create;
+    return host::SqlHost::Open(url, options);
+  } catch (const RunTimeError& error) {
+    throw Refusal(error.Description());
+  }
+}
+
+fs::path CheckedFolder(const Options& options) {
+  fs::path folder = ChosenFolder(options);
+  std::error_code failure;
+  if (!fs::is_directory(folder, failure)) throw Refusal(folder.string() + ": no such workspace folder");
+  if (options.database.empty() && !fs::is_regular_file(folder / kDatabaseFile, failure)) {
+    throw Refusal(folder.string() + ": not a workspace, it holds no " + std::string(kDatabaseFile) +
+                  " (`partnerkit new " + folder.string() + "` makes one)");
+  }
+  return folder;
+}
+
+// Folders made so far, taken away again unless all went well. Only empty ones go.
+class MadeFolders {
+ public:
+  ~MadeFolders() {
+    std::error_code ignored;
+    for (auto folder = made_.rbegin(); folder != made_.rend(); ++folder) fs::remove(*folder, ignored);
+  }
+  void Make(const fs::path& folder) {
+    std::error_code failure;
+    if (fs::is_directory(folder, failure)) return;
+    if (folder.has_parent_path() && folder.parent_path() != folder) Make(folder.parent_path());
+    fs::create_directory(folder, failure);
+    if (failure) throw Refusal(folder.string() + ": cannot be made: " + failure.message());
+    made_.push_back(folder);
+  }
+  void Keep() { made_.clear(); }
+
+ private:
+  std::vector<fs::path> made_;
+};
+
+}  // namespace
+
+void Command::Say(std::string_view message) const { err << "partnerkit: " << OneLine(message) << std::endl; }
+
+fs::path AbsolutePath(const fs::path& path) {
+  fs::path absolute = fs::absolute(path).lexically_normal();
+  if (!absolute.has_filename() && absolute.has_relative_path()) absolute = absolute.parent_path();
+  return absolute;
+}
+
+fs::path MakeWorkspace(const fs::path& folder, const std::string& database) {
+  fs::path workspace = AbsolutePath(folder);
+  const fs::path databaseFile = workspace / kDatabaseFile;
+  std::error_code failure;
+  if (fs::exists(databaseFile, failure)) throw Refusal(workspace.string() + ": is a workspace already");
+  MadeFolders made;
+  made.Make(workspace);
+  for (const std::string_view name : kFolders) made.Make(workspace / name);
+  if (database.empty()) {
+    try {
+      OpenStore(databaseFile.string(), true)->Close();
+    } catch (...) {
+      fs::remove(databaseFile, failure);
+      throw;
+    }
+  } else {
+    OpenStore(database, true)->Close();
+  }
+  made.Keep();
+  return workspace;
+}
+
+Workspace::Workspace(const Command& command) : folder_(CheckedFolder(command.options)) {
+  const Options& options = command.options;
+  const bool own = options.database.empty();
+  host_ = OpenStore(own ? (folder_ / kDatabaseFile).string() : options.database, !own);
+  ports_ = platform::DefaultPorts();
+  ports_.errorOutlets.applicationName = "partnerkit";
+  ports_.errorOutlets.dialog = [this, &command](const ErrorReport& report, const std::string&) {
+    command.Say(report.report);
+    hadFault_ = true;
+    return Button::kAbort;
+  };
+  if (options.now) {
+    fixedClock_.emplace(*options.now);
+    ports_.clock = &*fixedClock_;
+  }
+}
+
+}  // namespace partnerkit::cli

@@ -1,0 +1,100 @@
+#include <gmock/gmock.h>
+
+#include <limits>
+#include <sstream>
+
+#include "cli/json_writer.h"
+#include "cli/record_json.h"
+#include "cli/table.h"
+#include "cli/text.h"
+
+namespace partnerkit::cli {
+namespace {
+
+using namespace std::string_view_literals;
+
+TEST(Text, IsUtf8OrElseWindows1252) {
+  const std::pair<std::string_view, std::string_view> table[] = {
+      {"plain", "plain"},
+      {"Z\u00fcrich \u20ac \U0001F600", "Z\u00fcrich \u20ac \U0001F600"},
+      {"Z\xFCrich \x80", "Z\u00fcrich \u20ac"},
+      {"\x81\x9F\xFF", "\u0081\u0178\u00ff"},
+      {"\xC0\xAF", "\u00c0\u00af"},            // an overlong "/"
+      {"\xED\xA0\x80", "\u00ed\u00a0\u20ac"},  // half of a surrogate pair
+      {"\xF4\x90\x80\x80", "\u00f4\u0090\u20ac\u20ac"},
+      {"\u20ac\xE2\x82", "\u00e2\u201a\u00ac\u00e2\u201a"},
+      {"\0x"sv, "\0x"sv},
+  };
+  for (const auto& [bytes, text] : table) EXPECT_EQ(Utf8(bytes), text);
+}
+
+TEST(Text, StandsOnOneHarmlessLine) {
+  EXPECT_EQ(OneLine(" found. \r\n Add\tthis\x1b[2J\x7f \xC2\x9B 1\n"), "found. Add this?[2J? ? 1");
+  EXPECT_EQ(Width("\u20ac\u00e9-1"), 4U);
+}
+
+TEST(Text, ShowsTheShortestNumber) {
+  EXPECT_EQ(ShortestNumber(10.5), "10.5");
+  EXPECT_EQ(ShortestNumber(6), "6");
+  EXPECT_EQ(ShortestNumber(0.1 + 0.2), "0.30000000000000004");
+  EXPECT_EQ(ShortestNumber(1e308), "1e+308");
+}
+
+TEST(Json, PutsEachRowOnALineAndClosesWhatIsOpen) {
+  std::ostringstream out;
+  {
+    JsonWriter json(out);
+    json.BeginObject();
+    json.Name("none");
+    json.BeginArray();
+    json.EndArray();
+    json.Name("rows");
+    json.BeginArray();
+    for (const int row : {1, 2}) {
+      json.BeginArray();
+      json.Int(row);
+      json.Value(Cell("q\"\\\n\x02"));
+      json.Value(Cell(2.5));
+      json.Value(Cell(*DateTime::FromYmd(2004, 7, 31)));
+      json.Value(Cell());
+      json.Number(std::numeric_limits<double>::infinity());
+      json.EndArray();
+    }
+    json.BeginObject();
+    json.Name("cut short");
+  }
+  EXPECT_EQ(out.str(),
+            "{\n"
+            "  \"none\": [],\n"
+            "  \"rows\": [\n"
+            "    [1, \"q\\\"\\\\\\n\\u0002\", 2.5, \"2004-07-31\", null, null],\n"
+            "    [2, \"q\\\"\\\\\\n\\u0002\", 2.5, \"2004-07-31\", null, null],\n"
+            "    {\"cut short\": null}\n"
+            "  ]\n"
+            "}\n");
+}
+
+TEST(Table, BreaksTheLastColumnBetweenWords) {
+  std::ostringstream out;
+  const std::vector<std::vector<std::string>> rows = {{"7", "eins", "a message that is much too long for it"},
+                                                      {"12", "\u00e9", "averyverylongwordwithoutanyblank"}};
+  PrintTable(
+      out, {{"Id", true}, {"Name"}, {"Message"}}, 2, [&](std::size_t r, std::size_t c) { return rows[r][c]; }, 32,
+      [](std::size_t row) { return std::vector<std::string>(row, "a note of this row, longer than a line"); });
+  EXPECT_EQ(out.str(),
+            "Id  Name  Message\n"
+            "--  ----  ----------------------\n"
+            " 7  eins  a message that is much\n"
+            "          too long for it\n"
+            "12  \u00e9     averyverylongwordwitho\n"
+            "          utanyblank\n"
+            "    a note of this row, longer\n"
+            "      than a line\n");
+}
+
+TEST(Records, AreMadeOfEveryKind) {
+  for (const RecordType* type : AllRecordTypes()) EXPECT_NE(NewRecord(*type), nullptr) << type->kind;
+}
+
+}  // namespace
+}  // namespace partnerkit::cli
