@@ -136,7 +136,8 @@ TEST_F(Usage, ListsClassesAndDocuments) {
                                 {"Direction", "in"},
                                 {"Format", "CSV"}};
   EXPECT_EQ(Json({"classes"})["classes"][0], first);
-  EXPECT_THAT(Run({"classes"}).out, HasSubstr("PartnerKit.clsMGB850csv  Purchase order (850)"));
+  EXPECT_THAT(Run({"classes"}).out,
+              ::testing::ContainsRegex("PartnerKit.clsMGB850csv +Purchase order .850. +in +CSV\n"));
   EXPECT_EQ(Json({"docs"})["docs"][0]["MapFolder"], folder / "maps/");
   EXPECT_THAT(Run({"docs"}).out, HasSubstr("product, cost, retail"));
 }
