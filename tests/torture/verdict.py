@@ -1,0 +1,145 @@
+"""What has to hold once a plain run has followed the run that was struck."""
+
+import json
+import sqlite3
+
+import orders
+from workspace import BACKUP, EARLIER_BACKUP, ORDER_FILE
+
+DATABASE = "partnerkit.db"
+
+
+def violations(scenario, folder, program, last, *, settled_once=True, backup=True):
+    """`last` is the plain run; `settled_once`: at most one run before it came as far as the backup."""
+    found = []
+    if last.status not in (0, 1):
+        return [f"the plain run ends with status {last.status}: {last.err.strip()}"]
+    if last.err.strip() and "nothing to list" not in last.err:
+        found.append(f"the plain run says {last.err.strip()}")
+    found += store_violations(folder, orders.expected_store(scenario.file))
+    found += file_violations(scenario, folder)
+    if backup:
+        found += backup_violations(scenario, folder, last.posted(), settled_once)
+    found += leftovers(scenario, folder)
+    found += log_violations(folder, program)
+    return found
+
+
+def store_violations(folder, expected):
+    connection = sqlite3.connect(folder / DATABASE)
+    try:
+        sound = connection.execute("PRAGMA integrity_check").fetchone()[0]
+        if sound != "ok":
+            return [f"the database is damaged: {sound}"]
+        return orders_violations(connection, expected)
+    finally:
+        connection.close()
+
+
+def orders_violations(connection, expected):
+    found = []
+    stored = {}
+    for key, number, status in connection.execute("SELECT OrderId, PONo, Status FROM tbOrder").fetchall():
+        if number in stored:
+            found.append(f"{number} is stored twice")
+        if number not in expected:
+            found.append(f"{number} is stored and should not be")
+        if status != 0:
+            found.append(f"{number} is stored with Status {status}")
+        stored[number] = key
+    for number, parts in expected.items():
+        if number not in stored:
+            found.append(f"{number} is not stored")
+        elif parts_of(connection, stored[number]) != parts:
+            found.append(f"{number} is stored with other lines, locations or location lines")
+    for table, part in (("tbOrderLine", 0), ("tbOrderLocn", 1), ("tbOrderLocnLine", 2)):
+        count = connection.execute(f"SELECT COUNT(*) FROM {table}").fetchone()[0]
+        wanted = sum(len(parts[part]) for parts in expected.values())
+        if count != wanted:
+            found.append(f"{table} holds {count} records instead of {wanted}")
+    return found
+
+
+def parts_of(connection, key):
+    return (
+        sorted(connection.execute("SELECT ProductNo, Quantity, Cost FROM tbOrderLine WHERE OrderId=?", [key])),
+        sorted(connection.execute("SELECT BuyingLocn, ShipToLocn FROM tbOrderLocn WHERE OrderId=?", [key])),
+        sorted(connection.execute(
+            "SELECT c.BuyingLocn, l.ProductNo, q.Quantity, q.AllocateQty FROM tbOrderLocnLine q"
+            " JOIN tbOrderLine l ON l.LineId=q.LineId AND l.OrderId=q.OrderId AND l.ProductNo=q.ProductNo"
+            " JOIN tbOrderLocn c ON c.LocnId=q.LocnId AND c.OrderId=q.OrderId AND c.BuyingLocn=q.BuyingLocn"
+            " WHERE q.OrderId=?", [key])))
+
+
+def read(path):
+    return path.read_bytes() if path.exists() else b""
+
+
+def file_violations(scenario, folder):
+    content = read(folder / ORDER_FILE)
+    kept = scenario.file.kept()
+    if content == kept:
+        return []
+    present = set(content.splitlines(True))
+    lost = [order.number for order in scenario.file.orders
+            if order.fate == orders.KEPT and not present.issuperset(order.texts)]
+    left = [order.number for order in scenario.file.orders
+            if order.fate != orders.KEPT and not present.isdisjoint(order.texts)]
+    return [f"the order file is not what it should be: {len(content)} bytes instead of {len(kept)};"
+            f" lost {lost[:5]}, still there {left[:5]}"]
+
+
+def backup_violations(scenario, folder, posted_last, settled_once):
+    content = read(folder / BACKUP)
+    if not content.startswith(EARLIER_BACKUP):
+        return ["the backup has lost what it held before"]
+    texts = content[len(EARLIER_BACKUP):].splitlines(True)
+    owners = scenario.file.owners()
+    if any(text not in owners or orders.whole(text) != text for text in texts):
+        return ["the backup holds a broken or foreign line"]
+    if len(set(texts)) != len(texts):
+        return ["the backup holds a line twice"]
+    strays = {owners[text].number for text in texts if owners[text].fate != orders.POSTED}
+    if strays:
+        return [f"the backup holds orders that were never posted: {sorted(strays)[:5]}"]
+    of_last = [orders.whole(text) for order in scenario.file.posted() if order.number in posted_last
+               for text in order.texts]
+    earlier = texts[:len(texts) - len(of_last)]
+    if texts[len(earlier):] != of_last:
+        return ["the backup's end is not what the plain run posted"]
+    of_struck = [orders.whole(text) for order in scenario.file.posted() if order.number not in posted_last
+                 for text in order.texts]
+    if settled_once and earlier not in ([], of_struck):
+        return ["the backup holds some, not all or none, of the lines that the struck run posted"]
+    present = set(earlier)
+    halves = {owners[text].number for text in earlier
+              if not present.issuperset(map(orders.whole, owners[text].texts))}
+    return [f"the backup holds parts of orders: {sorted(halves)[:5]}"] if halves else []
+
+
+def leftovers(scenario, folder):
+    def names(top):
+        return {str(path.relative_to(top)) for path in top.rglob("*") if path.is_file()}
+
+    strange = names(folder) - names(scenario.prepared)
+    return [f"left over: {sorted(strange)}"] if strange else []
+
+
+def log_violations(folder, program):
+    ended = program.run(folder, "log")
+    try:
+        log = json.loads(ended.out)
+    except ValueError:
+        return [f"the log cannot be read: status {ended.status}: {ended.err.strip()}"]
+    records = log["log"] if isinstance(log, dict) else log
+    completed = [record["Message"] for record in records if record["Message"].endswith("import completed.")]
+    return [] if len(set(completed)) == len(completed) else ["the log has an order completed twice"]
+
+
+def struck_violations(ended, killed):
+    """What has to hold of the struck run itself."""
+    if killed:
+        return []
+    if ended.status not in (0, 1, 2):
+        return [f"the struck run ends with status {ended.status}: {ended.err.strip()[-500:]}"]
+    return []
