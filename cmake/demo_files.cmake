@@ -1,8 +1,23 @@
-# Puts the demo's files into the program, so that it needs none of its own beside it.
-foreach(name IN ITEMS records.json mgb850.map orders.csv)
-  set(file ${PROJECT_SOURCE_DIR}/samples/mgb850/${name})
-  set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${file})
-  file(READ ${file} demo_${name})
+# Puts the samples into the program, so that the demo needs no file beside it: of samples/mgb850 the main story's files, of each
+# other folder a map, an order file and records named for the folder.
+function(partnerkit_demo_file path file)
+  set_property(DIRECTORY ${PROJECT_SOURCE_DIR} APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${file})
+  file(READ ${file} text)
+  string(APPEND demo_entries "    {\"${path}\", R\"demo(${text})demo\"},\n")
+  set(demo_entries "${demo_entries}" PARENT_SCOPE)
+endfunction()
+
+set(samples ${PROJECT_SOURCE_DIR}/samples)
+partnerkit_demo_file(records.json ${samples}/mgb850/records.json)
+partnerkit_demo_file(maps/mgb850.map ${samples}/mgb850/mgb850.map)
+partnerkit_demo_file(inbox/orders.csv ${samples}/mgb850/orders.csv)
+file(GLOB folders CONFIGURE_DEPENDS LIST_DIRECTORIES true ${samples}/*)
+list(REMOVE_ITEM folders ${samples}/mgb850)
+foreach(folder IN LISTS folders)
+  cmake_path(GET folder FILENAME name)
+  partnerkit_demo_file(records/${name}.json ${folder}/records.json)
+  partnerkit_demo_file(maps/${name}.map ${folder}/${name}.map)
+  partnerkit_demo_file(inbox/${name}.csv ${folder}/orders.csv)
 endforeach()
 configure_file(${CMAKE_CURRENT_LIST_DIR}/demo_files.cpp.in ${PROJECT_BINARY_DIR}/demo_files.cpp @ONLY)
 target_sources(partnerkit_cli PRIVATE ${PROJECT_BINARY_DIR}/demo_files.cpp)

@@ -93,8 +93,8 @@ class System {
   virtual RecordStore& Records() = 0;
   // Who is signed on.
   virtual std::string UserId() = 0;
-  // Removes a stored order with its lines, locations and location lines. False when the host or the store refuses, and
-  // the order then stays whole.
+  // Removes a stored order with its lines, locations and location lines. False when the host refuses, or,
+  // with the cause in `NativeError`, when the store fails; the order then stays whole.
   virtual bool DeleteOrder(const Order& order) = 0;
   // Makes all that was stored since the last one durable. The argument is the host's; the library passes 0.
   virtual void Commit(std::int32_t mode) = 0;

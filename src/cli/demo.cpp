@@ -30,6 +30,7 @@ constexpr std::string_view kBackup = "backup/po.csv";
 constexpr std::size_t kShownColumns[] = {2, 7, 16, 20, 23, 24};
 
 void CopyFiles() {
+  fs::create_directory("records");
   for (const DemoFile& file : DemoFiles()) {
     std::ofstream out(fs::path(file.path), std::ios::binary);
     if (!(out << file.text).flush()) {
@@ -105,6 +106,7 @@ struct Step {
   std::string_view told;
   std::vector<std::string> words;
   int status;
+  std::string_view typed = {};  // what stands for the words, where a user would type less
 };
 
 const std::vector<Step>& MainJob() {
@@ -124,6 +126,21 @@ const std::vector<Step>& MainJob() {
       {"Everything that was said is kept in the run log:", {"log"}, kDone},
   };
   return kSteps;
+}
+
+// The other partners' samples. Their records are loaded in one go, as a shell's "*" would name them.
+std::vector<Step> OtherPartners() {
+  std::vector<std::string> load = {"data", "load"};
+  for (const DemoFile& file : DemoFiles()) {
+    if (file.path.starts_with("records/")) load.emplace_back(file.path);
+  }
+  return {
+      {"The supplier trades with more partners. Their records, maps and order files lie in the workspace as well:",
+       load, kDone, "data load records/*.json"},
+      {"Kmart, for one, releases parts of a blanket order; each release is an order of its own:",
+       {"process", "6", "inbox/kmart850.csv"},
+       kDone},
+  };
 }
 
 void PrintOrders(const Command& command) {
@@ -169,8 +186,9 @@ void Tell(const Command& command, std::string_view text) {
 }
 
 void TellStep(const Command& command, Steps& steps, const Step& step) {
-  Tell(command, step.told);
-  command.out << "\n$ " << steps.Typed(step.words) << '\n';
+  if (!step.told.empty()) Tell(command, step.told);
+  command.out << "\n$ " << (step.typed.empty() ? steps.Typed(step.words) : steps.Typed({std::string(step.typed)}))
+              << '\n';
   // Errors of the step go to another stream; they are not to overtake it.
   command.out.flush();
   steps.Expect(steps.Run(step.words, command.out), step.status);
@@ -198,6 +216,7 @@ void Talk(const Command& command, Steps& steps, const fs::path& workspace, const
   command.out << '\n';
   PrintOrders(command);
   TellFiles(command);
+  for (const Step& step : OtherPartners()) TellStep(command, steps, step);
   Tell(command, "To go on: correct the price in records.json, load it again and run the same `process` command.");
 }
 

@@ -17,7 +17,7 @@ struct DemoFile {
   std::string_view path;  // below the workspace
   std::string_view text;
 };
-// The files of samples/mgb850, as the build found them.
+// The files of samples/, as the build found them.
 std::span<const DemoFile> DemoFiles();
 
 }  // namespace partnerkit::cli

@@ -1,5 +1,6 @@
 #include "cli/run_document.h"
 
+#include <algorithm>
 #include <charconv>
 #include <limits>
 #include <memory>
@@ -53,6 +54,9 @@ class Run {
     translator_ = CreateTranslator(definition.ProgId, ports);
     if (!translator_) throw Refusal("document " + document + ": class \"" + definition.ProgId + "\" is not known");
   }
+
+  // Says at once, before anything is done, that the store cannot be written to.
+  void NeedWritableStore() { workspace_.Host().CheckWritable(); }
 
   // False when the class turned the file away; it is then abandoned, and its reason said.
   bool Open() {
@@ -129,20 +133,20 @@ class Run {
     const std::int32_t id = translator_->Process(row, result.errorLog);
     result.result = id;
     const bool orderGone = host_.OrdersDeleted() > deletedBefore;
-    result.outcome = id != 0                                           ? Outcome::kPosted
-                     : orderGone && SaysOnlyCancelled(result.errorLog) ? Outcome::kCancelled
-                                                                       : Outcome::kTurnedAway;
+    result.outcome = id != 0                                          ? Outcome::kPosted
+                     : orderGone && SaysOnlyWarnings(result.errorLog) ? Outcome::kCancelled
+                                                                      : Outcome::kTurnedAway;
     if (result.outcome == Outcome::kTurnedAway) status_ = kTurnedAway;
     report_.results.push_back(std::move(result));
   }
 
-  // A cancellation that was carried out leaves one warning and no id of an order.
-  bool SaysOnlyCancelled(const ErrorList& errorLog) {
-    if (!errorLog || errorLog->size() != 1) return false;
-    Log log;
-    log.LogId = errorLog->front();
-    return workspace_.Host().Records().Load(Log::kType, &log) && log.ErrorNumber == kWarning &&
-           Str(log.Message).find("Cancel Request") != std::string_view::npos;
+  // A cancellation that was carried out leaves warnings only, and no id of an order.
+  bool SaysOnlyWarnings(const ErrorList& errorLog) {
+    return errorLog && std::ranges::all_of(*errorLog, [&](std::int32_t id) {
+             Log log;
+             log.LogId = id;
+             return workspace_.Host().Records().Load(Log::kType, &log) && log.ErrorNumber == kWarning;
+           });
   }
 
   // The newest log record tells why.
@@ -189,6 +193,7 @@ int ShowRows(const Command& command, const std::string& document, const std::str
 int ProcessRows(const Command& command, const std::string& document, const std::string& file,
                 const std::vector<std::int64_t>& rows) {
   Run run(command, document, file);
+  run.NeedWritableStore();
   if (run.Open()) {
     run.CheckRows(rows);
     run.Process(rows);
@@ -199,6 +204,7 @@ int ProcessRows(const Command& command, const std::string& document, const std::
 
 int DeleteRow(const Command& command, const std::string& document, const std::string& file, std::int64_t row) {
   Run run(command, document, file);
+  run.NeedWritableStore();
   if (run.Open()) {
     run.CheckRows({row});
     run.Delete(row);

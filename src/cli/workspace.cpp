@@ -96,21 +96,39 @@ fs::path MakeWorkspace(const fs::path& folder, const std::string& database) {
   return workspace;
 }
 
-Workspace::Workspace(const Command& command) : folder_(CheckedFolder(command.options)) {
+Workspace::Workspace(const Command& command) : command_(command), folder_(CheckedFolder(command.options)) {
   const Options& options = command.options;
   const bool own = options.database.empty();
   host_ = OpenStore(own ? (folder_ / kDatabaseFile).string() : options.database, !own);
   ports_ = platform::DefaultPorts();
   ports_.errorOutlets.applicationName = "partnerkit";
-  ports_.errorOutlets.dialog = [this, &command](const ErrorReport& report, const std::string&) {
-    command.Say(report.report);
-    hadFault_ = true;
+  ports_.errorOutlets.dialog = [this](const ErrorReport& report, const std::string&) {
+    Tell(report.report);
     return Button::kAbort;
   };
   if (options.now) {
     fixedClock_.emplace(*options.now);
     ports_.clock = &*fixedClock_;
   }
+}
+
+Workspace::~Workspace() { TellRepeats(); }
+
+// A store that fails does so for every record; it is said once, and counted.
+void Workspace::Tell(const std::string& report) {
+  hadFault_ = true;
+  if (report == lastReport_) {
+    ++repeats_;
+    return;
+  }
+  TellRepeats();
+  command_.Say(report);
+  lastReport_ = report;
+}
+
+void Workspace::TellRepeats() {
+  if (repeats_ > 0) command_.Say("the error before this one came up " + std::to_string(repeats_) + " more times");
+  repeats_ = 0;
 }
 
 }  // namespace partnerkit::cli

@@ -25,6 +25,10 @@ class Workspace {
  public:
   // The workspace of the options, the environment or the current folder. Raises Refusal.
   explicit Workspace(const Command& command);
+  // Says how often the last error came up again.
+  ~Workspace();
+  Workspace(const Workspace&) = delete;
+  Workspace& operator=(const Workspace&) = delete;
 
   const std::filesystem::path& Folder() const { return folder_; }
   host::SqlHost& Host() { return *host_; }
@@ -33,11 +37,17 @@ class Workspace {
   bool HadFault() const { return hadFault_; }
 
  private:
+  void Tell(const std::string& report);
+  void TellRepeats();
+
+  const Command& command_;
   std::filesystem::path folder_;
   std::unique_ptr<host::SqlHost> host_;
   std::optional<platform::FixedClock> fixedClock_;
   Ports ports_;
   bool hadFault_ = false;
+  std::string lastReport_;
+  int repeats_ = 0;
 };
 
 }  // namespace partnerkit::cli

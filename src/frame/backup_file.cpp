@@ -114,7 +114,7 @@ void BackupFile::Settle() {
 }
 
 void BackupFile::WriteNote(InputFile& source, const std::string& sourcePath, const std::vector<ByteRange>& ranges) {
-  const std::string draft = NotePath() + ".tmp";
+  const std::string draft = DraftPath();
   const std::unique_ptr<OutputFile> note = files_.OpenOutput(draft, OutputMode::kReplace);
   note->Write(std::string(kNoteHead) + '\n' + std::to_string(file_->Length()) + '\n' + Escaped(sourcePath) + '\n' +
               source.Identity() + '\n');
@@ -129,6 +129,8 @@ void BackupFile::WriteNote(InputFile& source, const std::string& sourcePath, con
 }
 
 void BackupFile::FinishPending() {
+  // A note that never got its name tells of nothing that was begun.
+  if (files_.Exists(DraftPath())) files_.Delete(DraftPath());
   if (!files_.Exists(NotePath())) return;
   std::optional<Note> note;
   {

@@ -60,7 +60,9 @@ std::int32_t TranslatorBase::WriteLog(std::int32_t number, std::string_view proc
     log.NativeError = native;
     log.Message = std::string(message);
     Try([&] {
-      if (!Add(Records(), log)) throw RunTimeError(run_time::kDatabase, "The run log cannot be written");
+      if (Add(Records(), log)) return;
+      throw RunTimeError(run_time::kDatabase,
+                         "The run log cannot be written, database error " + std::to_string(Records().NativeError()));
     });
     id = lastLogId_ = log.LogId;
   });

@@ -57,9 +57,11 @@ void WorkQueue::Rewrite::Claim() {
   const std::unique_ptr<OutputFile> out = std::move(out_);
   if (out) out->Close();
   if (!queue_.File().StillNamed(queue_.path_)) {
-    throw RunTimeError(
-        run_time::kFileNotFound,
-        "The file " + queue_.path_ + " was taken away or replaced; what is left of it is in " + temporary_);
+    // The next rewrite would clear the temporary file away.
+    const std::string kept = queue_.path_ + ".kept";
+    queue_.files_.Rename(temporary_, kept);
+    throw RunTimeError(run_time::kFileNotFound,
+                       "The file " + queue_.path_ + " was taken away or replaced; what is left of it is in " + kept);
   }
 }
 

@@ -46,6 +46,7 @@ class BackupFile {
 
  private:
   std::string NotePath() const { return path_ + ".pending"; }
+  std::string DraftPath() const { return NotePath() + ".tmp"; }
   struct Note;
   static std::optional<Note> ReadNote(InputFile& file);
   void WriteNote(InputFile& source, const std::string& sourcePath, const std::vector<ByteRange>& ranges);
@@ -87,7 +88,7 @@ class WorkQueue {
     void Begin();
     void Keep(const Line& line) { out_->Write(line.raw); }
     void Finish() { out_->Sync(); }
-    // Fails when the order file is no longer the one held.
+    // Fails when the order file is no longer the one held; what was kept is then beside it, under its name and ".kept".
     void Claim();
     void Replace();
 

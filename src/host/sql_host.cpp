@@ -110,8 +110,17 @@ bool SqlHost::DeleteOrder(const Order& order) {
   } catch (const RunTimeError&) {
     done = false;
   }
+  // A constraint that forbids it is the host's own no, not a failure of the store.
+  if (!done && session.ForbiddenByConstraint()) session.Succeeded();
   if (opened && !done) session.Abandon();
   return done;
+}
+
+void SqlHost::CheckWritable() {
+  BeginTrans();
+  // Only a change shows that the file is read-only; this one changes nothing.
+  parts_->session.Execute("DELETE FROM \"tbLog\" WHERE 0 = 1");
+  RollbackTrans();
 }
 
 std::vector<EDIDoc> SqlHost::EDIDocList() {

@@ -43,6 +43,8 @@ class SqlHost : public System {
   std::vector<EDIDoc> EDIDocList() override;
   std::int32_t NextNumber(std::string_view partnerId, Counter counter) override;
 
+  // Raises RunTimeError when the database cannot be written to, or is locked by another program beyond the time-out.
+  void CheckWritable();
   // Commits what waits for it. Raises RunTimeError.
   void Close();
 

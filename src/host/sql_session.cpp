@@ -269,4 +269,6 @@ void SqlSession::GiveTurn() {
   lastTurn_ = steady_clock::now();
 }
 
+bool SqlSession::ForbiddenByConstraint() const { return (nativeError_ & 0xff) == SQLITE_CONSTRAINT; }
+
 }  // namespace partnerkit::host

@@ -70,6 +70,8 @@ class SqlSession {
 
   // The newest failure's number, 0 after a success.
   std::int32_t NativeError() const { return nativeError_; }
+  // The newest failure was a rule of the database, not a failing one.
+  bool ForbiddenByConstraint() const;
   void Succeeded() { nativeError_ = 0; }
   // Takes note of a failed statement: its number, and whether the transaction went with it.
   void Failed(const soci::soci_error& error);

@@ -7,6 +7,7 @@
 #include <string_view>
 #include <unordered_map>
 
+#include "partnerkit/records.h"
 #include "partnerkit/values.h"
 
 namespace partnerkit::orders {
@@ -25,6 +26,11 @@ struct ListedOrder {
   std::string Controls() const { return InterchangeCtl + GroupCtl + TransactionCtl; }
 };
 
+// The same of a stored order.
+inline std::string ControlsOf(const Order& order) {
+  return std::string(Str(order.InterchangeCtl)).append(Str(order.GroupCtl)).append(Str(order.TransactionCtl));
+}
+
 struct TextHash {
   using is_transparent = void;
   std::size_t operator()(std::string_view text) const { return std::hash<std::string_view>{}(text); }
@@ -38,6 +44,10 @@ class ProcessedOrders {
   void Add(std::string_view key, std::int32_t orderId) {
     std::int32_t& id = orders_.try_emplace(std::string(key), 0).first->second;
     if (orderId > 0) id = orderId;
+  }
+  // The order stored under the key is there no longer: its lines stay in the file unless they are dealt with anew.
+  void Forget(std::string_view key) {
+    if (const auto found = orders_.find(key); found != orders_.end()) orders_.erase(found);
   }
   // The order's id, 0 when it was turned away, nothing when it isn't dealt with.
   std::optional<std::int32_t> Find(std::string_view key) const {

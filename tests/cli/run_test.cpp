@@ -219,6 +219,9 @@ TEST(Demo, ShowsTheMainJobStepByStep) {
   EXPECT_THAT(ran.out, HasSubstr("4 rows, 3 posted, 1 not done."));
   EXPECT_THAT(ran.out, HasSubstr(" 3  4500012352  2006-03-07  2006-03-21         2       3     74  588.00\n"));
   EXPECT_THAT(ran.out, HasSubstr("  5 inbox/orders.csv\n 18 backup/po.csv\n 23 total\n"));
+  EXPECT_THAT(ran.out, HasSubstr("\n$ partnerkit data load records/*.json\n"));
+  EXPECT_THAT(ran.out, HasSubstr("K330871 REL# 2"));
+  EXPECT_THAT(ran.out, HasSubstr("2 rows, 2 posted.\n"));
   std::istringstream lines(ran.out);
   for (std::string line; std::getline(lines, line);) EXPECT_LE(line.size(), 100U) << line;
   EXPECT_EQ(RunPartnerkit(folder / "try-it", {"docs"}).status, 0);

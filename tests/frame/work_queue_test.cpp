@@ -90,7 +90,7 @@ TEST_F(WorkQueueTest, LeavesAFileThatTookTheOrderFilesPlace) {
     EXPECT_EQ(NumberRaised([&] { rewrite.Claim(); }), 53);
   }
   EXPECT_EQ(folder_.Read("orders.txt"), "c\n");
-  EXPECT_EQ(folder_.Read("orders.tmp"), "a\n");
+  EXPECT_EQ(folder_.Read("orders.txt.kept"), "a\n");
 }
 
 TEST_F(WorkQueueTest, IsHeldAgainstOtherPrograms) {

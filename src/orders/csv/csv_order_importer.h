@@ -117,6 +117,8 @@ class CsvOrderImporter : public TranslatorBase {
   bool SettleFile();
   void DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRange>& posted);
   void SettledKey(std::string& key, std::string& number) const;
+  std::string SettledKey(const ListedOrder& entry) const;
+  std::string SettledKey(const Order& stored) const;
   void MarkProcessed(const ListedOrder& entry);
   void DeleteWhenEmpty();
   void CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t begin, std::uint64_t end);
@@ -127,6 +129,8 @@ class CsvOrderImporter : public TranslatorBase {
   OrderFacts Facts(const Posting& posting) const;
   Next SettleStoredOrder(Posting& posting);
   Next CarryOut(Posting& posting, const OrderRule& rule, const Order& stored);
+  bool DeleteStored(const Order& stored);
+  bool MakeDurable();
   bool HasJobs(const Order& stored);
   Next RefuseNewOrder(Posting& posting);
   void NoteRule(Posting& posting, const OrderRule& rule);

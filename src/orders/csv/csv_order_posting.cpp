@@ -107,11 +107,9 @@ CsvOrderImporter::Next CsvOrderImporter::SettleStoredOrder(Posting& posting) {
   OrderFacts facts = Facts(posting);
   facts.storedType = Str(stored.TypeCode);
   facts.incomplete = stored.Status == kBeingStored;
-  const std::string controls =
-      std::string(Str(stored.InterchangeCtl)).append(Str(stored.GroupCtl)).append(Str(stored.TransactionCtl));
   // The same transaction again. One that an earlier run left half stored is no order yet: it is replaced, for turned
   // away it would be neither in the store nor in the file.
-  if (controls == posting.entry.Controls()) {
+  if (ControlsOf(stored) == posting.entry.Controls()) {
     if (facts.incomplete && !values_.postsWithErrors) {
       return CarryOut(posting, {.number = kWarning, .message = words::kIncomplete, .fate = Fate::kReplace}, stored);
     }
@@ -128,29 +126,46 @@ CsvOrderImporter::Next CsvOrderImporter::SettleStoredOrder(Posting& posting) {
 
 CsvOrderImporter::Next CsvOrderImporter::CarryOut(Posting& posting, const OrderRule& rule, const Order& stored) {
   NoteRule(posting, rule);
-  const auto deleted = [&] { return Try([&] { return Host().DeleteOrder(stored); }); };
+  const auto deleted = [&] { return DeleteStored(stored); };
   switch (rule.fate) {
     case Fate::kTurnAway:
       return TurnAway(posting);
     case Fate::kLeaveInFile:
       return Next::kEnd;
     case Fate::kReplace:
-      return deleted() ? Next::kGoOn : Next::kEnd;
+      if (!deleted()) return Next::kEnd;
+      processed_.Forget(SettledKey(stored));
+      return Next::kGoOn;
     case Fate::kCancel:
       deleted();
-      return TurnAway(posting);
+      return MakeDurable() ? TurnAway(posting) : Next::kEnd;
     case Fate::kCancelIfDeleted:
-      return deleted() ? TurnAway(posting) : Next::kEnd;
+      return deleted() && MakeDurable() ? TurnAway(posting) : Next::kEnd;
     case Fate::kCancelInFile:
       posting.entry.OrderId = 0;
       deleted();
       return Next::kEnd;
     case Fate::kCancelOrSay:
-      if (deleted()) return TurnAway(posting);
+      if (deleted()) return MakeDurable() ? TurnAway(posting) : Next::kEnd;
       posting.log.Note(kWarning, words::kCancelFailed.With(posting.entry.PONo));
       return Next::kEnd;
   }
   return Next::kEnd;
+}
+
+// A cancellation is durable before its order counts as done: a later failure of the store must not bring the order
+// back.
+bool CsvOrderImporter::MakeDurable() {
+  return Try([&] { Host().Commit(0); });
+}
+
+// False when the host says no. A store that fails is a fault: what was to be cancelled or replaced must come up again.
+bool CsvOrderImporter::DeleteStored(const Order& stored) {
+  return Try([&] {
+    if (Host().DeleteOrder(stored)) return true;
+    if (Records().NativeError() == 0) return false;
+    throw RunTimeError(run_time::kDatabase, "The stored PO " + stored.PONo + " cannot be deleted");
+  });
 }
 
 bool CsvOrderImporter::HasJobs(const Order& stored) {
@@ -387,7 +402,7 @@ std::int32_t CsvOrderImporter::Store(Posting& posting) {
   entry.OrderId = 0;
   if (!StoreDraft(*this, posting.log, posting.draft, posting.lineSequence)) return 0;
   const bool complete = !posting.checks.PassedWithErrors();
-  if (!MakeDurable(*this, posting.draft, complete)) return 0;
+  if (!orders::MakeDurable(*this, posting.draft, complete)) return 0;
   entry.OrderId = posting.draft.header.OrderId;
   MarkProcessed(entry);
   posting.log.Note(kInformation, (complete ? words::kImportCompleted : words::kImportWithErrors).With(entry.PONo));

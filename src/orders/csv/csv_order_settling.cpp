@@ -96,11 +96,15 @@ void CsvOrderImporter::SettledKey(std::string& key, std::string& number) const {
   for (const OrderField field : values_.transactionKey) key += line_[field];
 }
 
-void CsvOrderImporter::MarkProcessed(const ListedOrder& entry) {
-  std::string key = entry.PONo;
-  if (values_.settlesByControls) key.append(1, '\0').append(entry.Controls());
-  processed_.Add(key, entry.OrderId);
+std::string CsvOrderImporter::SettledKey(const ListedOrder& entry) const {
+  return values_.settlesByControls ? entry.PONo + '\0' + entry.Controls() : entry.PONo;
 }
+
+std::string CsvOrderImporter::SettledKey(const Order& stored) const {
+  return values_.settlesByControls ? stored.PONo + '\0' + ControlsOf(stored) : stored.PONo;
+}
+
+void CsvOrderImporter::MarkProcessed(const ListedOrder& entry) { processed_.Add(SettledKey(entry), entry.OrderId); }
 
 void CsvOrderImporter::DeleteWhenEmpty() {
   const std::string_view options = Str(Document().Options);
