@@ -8,46 +8,20 @@ namespace {
 
 using enum OrderField;
 
-constexpr OrderField kAdded[] = {INTDATE, RESPONSETYPECODE, DELIVERYPARTY, REQUIRED, TRADEDQUANTITY,
-                                 DELDATE, PROMODATE,        STATUS,        INNEREAN, INNERQTY};
-constexpr OrderField kRemoved[] = {CUSTCAT,           DEPTNO,         ADDATE, STOREZONE, UNITMEASURECODE, ORDERQUANTITY,
-                                   SKUPRODUCTKEYCODE, RETAILUNITPRICE};
 constexpr OrderField kOptional[] = {UNITMEASURECODE};
 constexpr OrderField kNumberFields[] = {PONUMBER, SHIPTOLOCPARTNERNO};
 
 constexpr std::size_t kShortNumber = 8;  // a longer order number is unique without its ship-to
 
-// clang-format off
-constexpr FieldText<Order> kHeader[] = {
-    {&Order::SupplierNo, SUPPLIERNO},
-    {&Order::Header2,    DELIVERYPARTY, false},
-};
-constexpr FieldText<OrderLine> kLine[] = {
-    {&OrderLine::LineNo,           SEQUENTIALLINENO, false},
-    {&OrderLine::ProductQualifier, PRODUCTQUALIFIER, false},
-    {&OrderLine::PriceCode,        UNITPRICECODE,    false},
-};
-constexpr FieldNumber<double> kLineNumbers[] = {
-    {&OrderLine::Cost, UNITPRICE},
-};
-// clang-format on
-
 constexpr CsvOrderValues kValues{
     .className = "clsCMLFLFPOcsv",
-    .added = kAdded,
-    .removed = kRemoved,
+    .added = kGtinAdded,
+    .removed = kGtinRemoved,
     .optional = kOptional,
     .orderKey = kNumberFields,
     .nullControls = true,
     .endsAtOtherCompany = true,
-    .posting = {.storedOrder = kGtinStoredOrder,
-                .newOrder = kGtinNewOrder,
-                .headerTexts = kHeader,
-                .quantity = TRADEDQUANTITY,
-                .lineTexts = kLine,
-                .lineNumbers = kLineNumbers,
-                .checks = {.sameABN = true, .retail = false},
-                .checksBuyingLocn = false},
+    .posting = kGtinPosting,
     .keepsForeignLines = true,
     .keepsTurnedAway = true,
 };

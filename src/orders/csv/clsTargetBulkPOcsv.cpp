@@ -10,42 +10,26 @@ using enum OrderField;
 
 constexpr OrderField kAdded[] = {INTDATE,   RESPONSETYPECODE, DELIVERYPARTY, REQUIRED, TRADEDQUANTITY, DELDATE,
                                  PROMODATE, STATUS,           INNEREAN,      INNERQTY, UNITSINNERPACK};
-constexpr OrderField kRemoved[] = {CUSTCAT,           DEPTNO,         ADDATE, STOREZONE, UNITMEASURECODE, ORDERQUANTITY,
-                                   SKUPRODUCTKEYCODE, RETAILUNITPRICE};
 
 // clang-format off
-constexpr FieldText<Order> kHeader[] = {
-    {&Order::SupplierNo, SUPPLIERNO},
-    {&Order::Header2,    DELIVERYPARTY, false},
-};
-constexpr FieldText<OrderLine> kLine[] = {
-    {&OrderLine::LineNo,           SEQUENTIALLINENO, false},
-    {&OrderLine::ProductQualifier, PRODUCTQUALIFIER, false},
-    {&OrderLine::PriceCode,        UNITPRICECODE,    false},
-};
-constexpr FieldNumber<double> kLineNumbers[] = {
-    {&OrderLine::Cost, UNITPRICE},
-};
 constexpr FieldNumber<std::optional<double>> kPackNumbers[] = {
     {&OrderLine::PackSize, UNITSINNERPACK},
 };
 // clang-format on
 
+constexpr PostingValues BulkPosting() {
+  PostingValues values = kGtinPosting;
+  values.lineNumbersOrNull = kPackNumbers;
+  return values;
+}
+
 constexpr CsvOrderValues kValues{
     .className = "clsTargetBulkPOcsv",
     .added = kAdded,
-    .removed = kRemoved,
+    .removed = kGtinRemoved,
     .nullControls = true,
     .endsAtOtherCompany = true,
-    .posting = {.storedOrder = kGtinStoredOrder,
-                .newOrder = kGtinNewOrder,
-                .headerTexts = kHeader,
-                .quantity = TRADEDQUANTITY,
-                .lineTexts = kLine,
-                .lineNumbers = kLineNumbers,
-                .lineNumbersOrNull = kPackNumbers,
-                .checks = {.sameABN = true, .retail = false},
-                .checksBuyingLocn = false},
+    .posting = BulkPosting(),
     .keepsForeignLines = true,
     .keepsTurnedAway = true,
 };

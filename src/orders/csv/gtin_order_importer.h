@@ -32,6 +32,42 @@ inline constexpr OrderRule kGtinNewOrder[] = {
 };
 // clang-format on
 
+// What their files have besides, and haven't.
+inline constexpr OrderField kGtinAdded[] = {
+    OrderField::INTDATE,        OrderField::RESPONSETYPECODE, OrderField::DELIVERYPARTY, OrderField::REQUIRED,
+    OrderField::TRADEDQUANTITY, OrderField::DELDATE,          OrderField::PROMODATE,     OrderField::STATUS,
+    OrderField::INNEREAN,       OrderField::INNERQTY};
+inline constexpr OrderField kGtinRemoved[] = {
+    OrderField::CUSTCAT,           OrderField::DEPTNO,          OrderField::ADDATE,
+    OrderField::STOREZONE,         OrderField::UNITMEASURECODE, OrderField::ORDERQUANTITY,
+    OrderField::SKUPRODUCTKEYCODE, OrderField::RETAILUNITPRICE};
+
+// clang-format off
+inline constexpr FieldText<Order> kGtinHeaderTexts[] = {
+    {&Order::SupplierNo, OrderField::SUPPLIERNO},
+    {&Order::Header2,    OrderField::DELIVERYPARTY, false},
+};
+inline constexpr FieldText<OrderLine> kGtinLineTexts[] = {
+    {&OrderLine::LineNo,           OrderField::SEQUENTIALLINENO, false},
+    {&OrderLine::ProductQualifier, OrderField::PRODUCTQUALIFIER, false},
+    {&OrderLine::PriceCode,        OrderField::UNITPRICECODE,    false},
+};
+inline constexpr FieldNumber<double> kGtinLineNumbers[] = {
+    {&OrderLine::Cost, OrderField::UNITPRICE},
+};
+// clang-format on
+
+inline constexpr PostingValues kGtinPosting{
+    .storedOrder = kGtinStoredOrder,
+    .newOrder = kGtinNewOrder,
+    .headerTexts = kGtinHeaderTexts,
+    .quantity = OrderField::TRADEDQUANTITY,
+    .lineTexts = kGtinLineTexts,
+    .lineNumbers = kGtinLineNumbers,
+    .checks = {.sameABN = true, .retail = false},
+    .checksBuyingLocn = false,
+};
+
 class GtinOrderImporter : public CsvOrderImporter {
  protected:
   using CsvOrderImporter::CsvOrderImporter;
