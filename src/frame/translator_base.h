@@ -58,6 +58,8 @@ class TranslatorBase : public Translator {
   RecordStore& Records() const { return system_->Records(); }
   Files& FileSystem() const { return *ports_.files; }
   DateTime Now() const { return ports_.clock->Now(); }
+  Clock& WallClock() const { return *ports_.clock; }
+  const ComponentFactory& Components() const { return ports_.components; }
   const EDIDoc& Document() const { return document_; }
   const Partner& TradingPartner() const { return partner_; }
   const Vendor& OwnCompany() const { return vendor_; }
@@ -97,6 +99,8 @@ class CallLog {
     const std::int32_t id = translator_.WriteLog(number, procedure_, message);
     if (id != 0) ids_.push_back(id);
   }
+  // What the caller will be shown, for another component to add to.
+  std::vector<std::int32_t>& Ids() { return ids_; }
 
  private:
   TranslatorBase& translator_;
