@@ -1,6 +1,7 @@
 #include <algorithm>
 #include <charconv>
 
+#include "frame/line_reader.h"
 #include "frame/work_queue.h"
 
 namespace partnerkit {

@@ -1,5 +1,8 @@
 #include "frame/work_queue.h"
 
+#include <algorithm>
+#include <span>
+
 namespace partnerkit {
 
 std::string TemporaryName(std::string_view path) {
@@ -12,20 +15,10 @@ std::string TemporaryName(std::string_view path) {
 
 void WorkQueue::Open(const std::string& path) {
   path_ = path;
-  lines_.reset();
   file_ = files_.OpenInput(path, Share::kExclusive);
-  lines_.emplace(*file_);
 }
 
-void WorkQueue::Close() {
-  lines_.reset();
-  file_.reset();
-}
-
-LineReader& WorkQueue::Lines() {
-  File();
-  return *lines_;
-}
+void WorkQueue::Close() { file_.reset(); }
 
 InputFile& WorkQueue::File() {
   if (!file_) throw RunTimeError(run_time::kBadFileName, "The order file is not open");
@@ -66,5 +59,21 @@ void WorkQueue::Rewrite::Claim() {
 }
 
 void WorkQueue::Rewrite::Replace() { queue_.files_.Rename(temporary_, queue_.path_); }
+
+void WorkQueue::Rewrite::Remove(bool withTemporary) {
+  queue_.files_.Delete(queue_.path_);
+  if (withTemporary) queue_.files_.Delete(temporary_);
+}
+
+void WorkQueue::Rewrite::KeepRange(ByteRange range) {
+  std::vector<char> block(256 * 1024);
+  while (range.begin < range.end) {
+    const std::size_t wanted = std::min<std::uint64_t>(block.size(), range.end - range.begin);
+    const std::size_t read = queue_.File().ReadAt(range.begin - 1, std::span(block).first(wanted));
+    if (read == 0) throw RunTimeError(run_time::kPastEnd, "The file " + queue_.path_ + " became shorter");
+    Keep({block.data(), read});
+    range.begin += read;
+  }
+}
 
 }  // namespace partnerkit

@@ -9,7 +9,6 @@
 #include <string_view>
 #include <vector>
 
-#include "frame/line_reader.h"
 #include "partnerkit/ports.h"
 
 namespace partnerkit {
@@ -60,7 +59,7 @@ class BackupFile {
   bool pending_ = false;
 };
 
-// The inbound file.
+// The inbound file. How it is read is its reader's matter; see LineReader and SegmentReader.
 class WorkQueue {
  public:
   explicit WorkQueue(Files& files) : files_(files) {}
@@ -71,13 +70,11 @@ class WorkQueue {
   void Close();
   const std::string& Path() const { return path_; }
   // Raises RunTimeError when the file isn't open.
-  LineReader& Lines();
   InputFile& File();
 
-  // A rewrite, in this order: `Begin` makes the temporary file, `Keep` takes each line that stays, `Finish` brings it
-  // to the disk, `Claim` and `Replace` put it in the order file's place. All raise RunTimeError. An object that goes
-  // before `Claim` takes the temporary file with it; from then on that stays, beside an order file that keeps all its
-  // lines.
+  // A rewrite, in this order: `Begin` makes the temporary file, `Keep` takes what stays, `Finish` brings it to the
+  // disk, `Claim` and `Replace` put it in the order file's place. All raise RunTimeError. An object that goes before
+  // `Claim` takes the temporary file with it; from then on that stays, beside an order file that keeps all its lines.
   class Rewrite {
    public:
     explicit Rewrite(WorkQueue& queue);
@@ -86,11 +83,15 @@ class WorkQueue {
     Rewrite& operator=(const Rewrite&) = delete;
 
     void Begin();
-    void Keep(const Line& line) { out_->Write(line.raw); }
+    void Keep(std::string_view bytes) { out_->Write(bytes); }
     void Finish() { out_->Sync(); }
     // Fails when the order file is no longer the one held; what was kept is then beside it, under its name and ".kept".
     void Claim();
     void Replace();
+    // In the place of `Replace`, when nothing stays: the order file goes, and the temporary file unless it is to stay.
+    void Remove(bool withTemporary);
+    // Copies bytes of the order file, positions from 1.
+    void KeepRange(ByteRange range);
 
    private:
     WorkQueue& queue_;
@@ -102,7 +103,6 @@ class WorkQueue {
   Files& files_;
   std::string path_;
   std::unique_ptr<InputFile> file_;
-  std::optional<LineReader> lines_;
 };
 
 }  // namespace partnerkit

@@ -21,6 +21,7 @@ struct ListedOrder {
   std::optional<DateTime> PODate;
   std::int64_t FilePos = 0;  // of the first line, from 1
   std::int32_t OrderId = 0;  // of the stored order; 0 when it isn't stored or was turned away
+  bool done = false;         // nothing is left to do about it: its transaction leaves the file
 
   // The control numbers joined, as transactions are told apart.
   std::string Controls() const { return InterchangeCtl + GroupCtl + TransactionCtl; }

@@ -56,8 +56,9 @@ std::optional<Product> OrderChecks::CheckProduct(const LineClaims& line) {
     return std::nullopt;
   }
   if (rules_.symbology == Symbology::kSkip || Str(product.Symbology) == line.qualifier) return product;
-  const std::string difference = "barcode " + number + " symbology " + std::string(line.qualifier) +
-                                 " does not agree with database symbology " + std::string(Str(product.Symbology));
+  const std::string difference = std::string(rules_.symbologyOf) + number + std::string(rules_.symbologyClaim) +
+                                 std::string(line.qualifier) + " does not agree with database symbology " +
+                                 std::string(Str(product.Symbology));
   if (rules_.symbology == Symbology::kWarn) {
     log_.Note(kRejection, Opening("...Warning PO ", ", ") + difference);
     return product;
@@ -66,30 +67,35 @@ std::optional<Product> OrderChecks::CheckProduct(const LineClaims& line) {
   return std::nullopt;
 }
 
-ProductPrice OrderChecks::ReadPrice(std::string_view productNo) {
+ProductPrice OrderChecks::ReadPrice(std::string_view productNo, bool needed) {
   ProductPrice price;
   price.VendorId = translator_.OwnCompany().VendorId;
   price.ProductNo = productNo;
   if (!translator_.Try([&] { return Load(translator_.Records(), price); })) {
     RejectProduct("pricing details for product " + price.ProductNo + " does not exist.");
+    if (needed) ok_ = false;
   }
   return price;
 }
 
-void OrderChecks::CheckPrice(const LineClaims& line) {
+ProductPrice OrderChecks::CheckPrice(const LineClaims& line) {
   const EDIDoc& document = translator_.Document();
-  const ProductPrice price = ReadPrice(line.productNo);
+  const ProductPrice price = ReadPrice(line.productNo, line.needsPrice);
   if (document.ValidateCost && translator_.Try([&] { return price.Cost != NumberAtStart(line.cost); })) {
     RejectProduct(Disagreement(line.productNo, " cost price ", line.cost, "cost ", NumberText(price.Cost)));
   }
-  if (!document.ValidateRetail || !rules_.retail) return;
-  const double retail = price.Retail.value_or(0);
-  if (translator_.Try([&] { return retail != NumberAtStart(line.retail); })) {
-    RejectProduct(Disagreement(line.productNo, " retail price ", line.retail, "retail ", NumberText(retail)));
-  }
+  if (!document.ValidateRetail || !rules_.retail) return price;
+  CheckRetail(price, line.retail);
   if (Str(price.SKU) != line.sku) {
     RejectProduct(Disagreement(line.productNo, " SKU ", line.sku, "SKU ", Str(price.SKU)));
   }
+  return price;
+}
+
+void OrderChecks::CheckRetail(const ProductPrice& price, std::string_view claimed) {
+  const double retail = price.Retail.value_or(0);
+  if (translator_.Try([&] { return retail == NumberAtStart(claimed); })) return;
+  RejectProduct(Disagreement(price.ProductNo, " retail price ", claimed, "retail ", NumberText(retail)));
 }
 
 const PartnerLocn* OrderChecks::FindLocation(std::string_view locationNo) {

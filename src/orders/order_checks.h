@@ -23,6 +23,8 @@ enum class Symbology {
 struct CheckRules {
   std::string_view before = "...Cannot process PO ";
   std::string_view after = ", ";
+  std::string_view symbologyOf = "barcode ";  // how the message on a symbology calls the number and the claim
+  std::string_view symbologyClaim = " symbology ";
   bool vendor = true;    // the product must be the partner's
   bool sameABN = false;  // a product of another partner will do when both have one Australian business number
   bool uom = true;
@@ -38,6 +40,7 @@ struct LineClaims {
   std::string_view cost;
   std::string_view retail;
   std::string_view sku;
+  bool needsPrice = false;  // a missing price record stops the order whatever other faults may pass
 };
 
 class OrderChecks {
@@ -49,6 +52,7 @@ class OrderChecks {
   // From here on a fault of a product or price lets the order be stored, incomplete, for data maintenance or an order
   // acknowledgement to settle.
   void LetFaultsPass() { faultsPass_ = true; }
+  bool FaultsPass() const { return faultsPass_; }
 
   bool Ok() const { return ok_; }
   bool PassedWithErrors() const { return errors_; }
@@ -64,9 +68,10 @@ class OrderChecks {
   // Whether a product of this partner id may be on the order.
   bool IsPartners(const std::string& partnerId);
   // The price is there, and as far as the document definition asks agrees in cost, retail and SKU.
-  void CheckPrice(const LineClaims& line);
+  ProductPrice CheckPrice(const LineClaims& line);
+  void CheckRetail(const ProductPrice& price, std::string_view claimed);
   // The price record of the product; its absence is noted, and a price of 0 then stands in for it.
-  ProductPrice ReadPrice(std::string_view productNo);
+  ProductPrice ReadPrice(std::string_view productNo, bool needed = false);
 
   // The location, read once a call; null when there is none.
   const PartnerLocn* FindLocation(std::string_view locationNo);

@@ -15,9 +15,9 @@ bool FitsVersion(Version version, std::string_view given) {
 bool Fits(const OrderRule& rule, const OrderFacts& facts) {
   return FitsCode(rule.purpose, facts.purpose) && FitsCode(rule.type, facts.type) &&
          (rule.otherType.empty() || rule.otherType != facts.type) && FitsCode(rule.storedType, facts.storedType) &&
-         FitsCode(rule.response, facts.response) && FitsVersion(rule.version, facts.version) &&
-         FitsJobs(rule.jobs, facts.hasJobs) && (!rule.incomplete || facts.incomplete) &&
-         (!rule.directToStore || facts.directToStore);
+         FitsCode(rule.storedChangeFlag, facts.storedChangeFlag) && FitsCode(rule.response, facts.response) &&
+         FitsVersion(rule.version, facts.version) && FitsJobs(rule.jobs, facts.hasJobs) &&
+         (!rule.incomplete || facts.incomplete) && (!rule.directToStore || facts.directToStore);
 }
 
 }  // namespace

@@ -28,8 +28,11 @@ enum class Fate {
   kReplace,      // the stored order is deleted and the new one posted; a refused deletion leaves the order in the file
   kCancel,       // the stored order is deleted, if the host agrees, and the new one leaves the file
   kCancelIfDeleted,  // the same, but a refused deletion leaves the order in the file
-  kCancelOrSay,      // the same, and the refusal is noted
   kCancelInFile,     // the stored order is deleted, if the host agrees, and the new one stays in the file
+  kCancelThenSay,    // the stored order is deleted, and only then the message noted; the call gives the order's id, and
+                     // the new one stays in the file. After a refused deletion it leaves the file.
+  kChangeStored,     // the stored order is changed as the importer knows how
+  kGoOn,             // of a new order: it is posted, unless a later rule has it otherwise
 };
 
 // Every condition left at its default fits anything.
@@ -38,7 +41,8 @@ struct OrderRule {
   std::string_view type = {};        // order types, likewise
   std::string_view otherType = {};   // fits every type but this one
   std::string_view storedType = {};  // type of the stored order
-  std::string_view response = {};    // response type
+  std::string_view storedChangeFlag = {};
+  std::string_view response = {};  // response type
   Version version = Version::kAny;
   Jobs jobs = Jobs::kAny;
   bool incomplete = false;     // only an order that an earlier run left at Status 9
@@ -46,6 +50,7 @@ struct OrderRule {
 
   std::int32_t number = 0;  // of the log record
   Words message = {};
+  Words refused = {};       // noted when the host refuses the deletion
   bool fileNumber = false;  // the message shows the number as the file has it, without what the order key adds
   Fate fate = Fate::kTurnAway;
 };
@@ -58,6 +63,8 @@ struct OrderFacts {
   std::string_view version;
   bool directToStore = false;
   std::string_view storedType;
+  std::string_view storedChangeFlag;
+  std::string_view fileNumber;  // the order number as the file has it
   bool hasJobs = false;
   bool incomplete = false;
 };

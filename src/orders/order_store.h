@@ -9,6 +9,8 @@
 
 namespace partnerkit::orders {
 
+inline constexpr std::int32_t kBeingStored = 9;  // Order.Status of an order that isn't complete
+
 // Stores the four kinds of record in their order, the header at Status 9, so that a store that fails half way leaves an
 // order that the next run recognises and replaces. False when a record was refused: the failure is noted, the header's
 // `OrderId` is 0, and what was stored stays. `lineSequence` is what the messages call the line: the sequence of the

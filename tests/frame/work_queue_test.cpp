@@ -1,5 +1,7 @@
 #include "frame/work_queue.h"
 
+#include "frame/line_reader.h"
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -44,9 +46,9 @@ class WorkQueueTest : public ::testing::Test {
   // Keeps the lines that don't begin with "-".
   void Deal(WorkQueue::Rewrite& rewrite) {
     rewrite.Begin();
-    queue_.Lines().Seek(1);
-    for (Line line; queue_.Lines().Read(line);) {
-      if (!line.text.starts_with("-")) rewrite.Keep(line);
+    LineReader lines(queue_.File());
+    for (Line line; lines.Read(line);) {
+      if (!line.text.starts_with("-")) rewrite.Keep(line.raw);
     }
     rewrite.Finish();
   }
@@ -103,7 +105,7 @@ TEST_F(WorkQueueTest, IsHeldAgainstOtherPrograms) {
   queue_.Open(folder_ / "orders.txt");
   EXPECT_EQ(NumberRaised([&] { WorkQueue(files_).Open(folder_ / "orders.txt"); }), 70);
   queue_.Close();
-  EXPECT_EQ(NumberRaised([&] { queue_.Lines(); }), 52);
+  EXPECT_EQ(NumberRaised([&] { queue_.File(); }), 52);
 }
 
 // What is appended in these tests: the lines "-b" and "-d" of "a\r\n-b\r\nc\r\n-d".

@@ -62,7 +62,6 @@ constexpr CsvOrderValues kValues{
                            .uom = false,
                            .symbology = Symbology::kWarn,
                            .retail = false}},
-    .postsWithErrors = true,
 };
 
 }  // namespace

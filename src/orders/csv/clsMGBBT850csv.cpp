@@ -25,7 +25,7 @@ constexpr OrderRule kMerchNewOrder[] = {
     {.purpose = "01", .number = kWarning, .message = words::kCancel, .fate = Fate::kLeaveInFile},
 };
 constexpr OrderRule kCustomerStoredOrder[] = {
-    {.purpose = "1", .type = "230", .jobs = Jobs::kNone, .number = kWarning,   .message = words::kCancelProcessed, .fate = Fate::kCancelOrSay},
+    {.purpose = "1", .type = "230", .jobs = Jobs::kNone, .number = kWarning,   .message = words::kCancelProcessed, .refused = words::kCancelFailed, .fate = Fate::kCancelIfDeleted},
     {                .type = "230", .jobs = Jobs::kNone, .number = kWarning,   .message = words::kChangeProcessed, .fate = Fate::kReplace},
     {.incomplete = true,                                 .number = kWarning,   .message = words::kIncomplete,      .fate = Fate::kReplace},
     {                                                    .number = kRejection, .message = words::kAlreadyExists},

@@ -10,15 +10,14 @@
 #include <vector>
 
 #include "frame/field_map.h"
-#include "frame/work_queue.h"
+#include "frame/line_reader.h"
 #include "orders/csv/csv_order_line.h"
 #include "orders/csv/csv_order_values.h"
-#include "orders/listed_order.h"
-#include "orders/order_draft.h"
+#include "orders/order_importer.h"
 
 namespace partnerkit::orders {
 
-class CsvOrderImporter : public TranslatorBase {
+class CsvOrderImporter : public OrderImporter {
  public:
   bool Init(System& system, std::int16_t EDIDocId, ColumnTable& Columns) override;
   std::int32_t Load(const std::string& a_sFileName, RowTable& a_vtRows) override;
@@ -33,20 +32,12 @@ class CsvOrderImporter : public TranslatorBase {
  protected:
   CsvOrderImporter(const CsvOrderValues& values, const Ports& ports);
 
-  // One call of `Process`.
-  struct Posting {
+  struct Posting : OrderPosting {
     Posting(CsvOrderImporter& importer, ListedOrder& listed, const PostingValues& postingValues, ErrorList& errorList);
 
-    ListedOrder& entry;
     const PostingValues& values;
-    CallLog log;
-    OrderDraft draft;
-    OrderChecks checks;
     std::string firstLineKey;
     std::string lineSequence;  // of the line last read
-    std::string shipTo;        // current ship-to and buying location
-    std::string buyingLocn;
-    std::string locationLookedAt;
   };
 
   // The line's product: the number it is ordered by, and the product that stands for.
@@ -55,8 +46,6 @@ class CsvOrderImporter : public TranslatorBase {
     std::string productNo;
     Text GTIN = {};
   };
-
-  enum class Next { kGoOn, kEnd };
 
   // --- Steps of the listing
   // The number that the line's order is listed, posted and settled under; `number` may hold it on return.
@@ -94,10 +83,8 @@ class CsvOrderImporter : public TranslatorBase {
   // The line's claims about its product, which goes by this number.
   LineClaims Claims(std::string_view productNo) const;
   void FitProductMaster();
-  void CheckShipTo(Posting& posting, std::string_view wanted);
   void CheckBuyingLocn(Posting& posting);
-  // Marks the entry as dealt with for good without being stored: its lines leave the file.
-  Next TurnAway(Posting& posting);
+  void MarkTurnedAway(ListedOrder& entry) override;
 
   const CsvOrderValues& values_;
 
@@ -106,49 +93,39 @@ class CsvOrderImporter : public TranslatorBase {
   bool TakeMapFile(const std::string& path);
   bool ExpectFields();
   bool SetOrderList(const std::string& path);
-  bool HoldOrderFile(const std::string& path);
   void ListTransactions();
   bool IsOurs() const;
   void JoinLineKey(std::string& key) const;
-  void FillRows(RowTable& rows) const;
   bool ReadLine(Line& line);
-  ListedOrder* EntryOfRow(std::int32_t row);
 
   bool SettleFile();
   void DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRange>& posted);
   void SettledKey(std::string& key, std::string& number) const;
   std::string SettledKey(const ListedOrder& entry) const;
   std::string SettledKey(const Order& stored) const;
-  void MarkProcessed(const ListedOrder& entry);
-  void DeleteWhenEmpty();
+  void MarkPosted(ListedOrder& entry) override;
+  void Forget(const Order& stored) override { processed_.Forget(SettledKey(stored)); }
+  // Raises RunTimeError when the order file isn't open.
+  LineReader& Lines();
+  void CloseOrderFile();
   void CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t begin, std::uint64_t end);
 
   Next StartPosting(Posting& posting);
   bool SeekTo(const ListedOrder& entry);
   bool NextLine(Posting& posting);
   OrderFacts Facts(const Posting& posting) const;
-  Next SettleStoredOrder(Posting& posting);
-  Next CarryOut(Posting& posting, const OrderRule& rule, const Order& stored);
-  bool DeleteStored(const Order& stored);
-  bool MakeDurable();
-  bool HasJobs(const Order& stored);
-  Next RefuseNewOrder(Posting& posting);
-  void NoteRule(Posting& posting, const OrderRule& rule);
   Next ReadLines(Posting& posting);
   bool EndsTransaction(const Posting& posting, std::string& key) const;
   Next TakeLine(Posting& posting);
   void TakeLocation(Posting& posting);
   Next AddToLocation(Posting& posting, const LineProduct& product);
-  std::int32_t Store(Posting& posting);
 
   FieldMap fieldMap_;
   MapHeader mapHeader_;
   bool mapLoaded_ = false;
   CsvOrderLine line_;
-  WorkQueue queue_;
+  std::optional<LineReader> lines_;
   BackupFile backup_;
-  std::string fileName_;
-  std::vector<ListedOrder> listed_;
   ProcessedOrders processed_;
 };
 

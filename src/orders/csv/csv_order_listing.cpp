@@ -29,7 +29,7 @@ std::vector<OrderField> ExpectedFields(const CsvOrderValues& values) {
 }  // namespace
 
 CsvOrderImporter::CsvOrderImporter(const CsvOrderValues& values, const Ports& ports)
-    : TranslatorBase(values.className, ports), values_(values), queue_(FileSystem()), backup_(FileSystem()) {}
+    : OrderImporter(values.className, ports), values_(values), backup_(FileSystem()) {}
 
 bool CsvOrderImporter::Init(System& system, std::int16_t EDIDocId, ColumnTable& Columns) {
   return Procedure("Function Init", false, [&](bool& done) {
@@ -53,13 +53,7 @@ std::int32_t CsvOrderImporter::Load(const std::string& a_sFileName, RowTable& a_
   return Procedure("Function Load", std::int32_t{0}, [&](std::int32_t& rows) {
     fileName_ = a_sFileName;
     if (!mapLoaded_ && !OpenMapFile(std::string(Str(Document().MapFolder)).append(Str(Document().MapFile)))) return;
-    if (!SetOrderList(fileName_)) return;
-    if (listed_.empty()) {
-      WriteLog(ErrorNumber(), "Load", "No orders found to match EDI addresses.");
-      return;
-    }
-    FillRows(a_vtRows);
-    rows = static_cast<std::int32_t>(listed_.size());
+    if (SetOrderList(fileName_)) rows = ShowRows(a_vtRows);
   });
 }
 
@@ -111,29 +105,12 @@ bool CsvOrderImporter::ExpectFields() {
 bool CsvOrderImporter::SetOrderList(const std::string& path) {
   return Procedure("Function SetOrderList", false, [&](bool& listed) {
     listed_.clear();
-    if (!HoldOrderFile(path)) return;
+    if (!FindOrderFile(path) || !HoldOrderFile(path)) return;
+    lines_.emplace(queue_.File());
     ListTransactions();
     if (values_.importsProducts && !Str(OwnCompany().ProductImportFile).empty()) ImportProduct(*this);
     listed = true;
   });
-}
-
-bool CsvOrderImporter::HoldOrderFile(const std::string& path) {
-  const HandlerOff off(Errors());
-  std::uint64_t length = 0;
-  if (!Try([&] { length = FileSystem().Length(path); })) {
-    WriteLog(ErrorNumber(), "SetOrderList", "File " + path + " does not exist.");
-    return false;
-  }
-  if (length == 0) {
-    WriteLog(ErrorNumber(), "SetOrderList", "File " + path + " is empty.");
-    return false;
-  }
-  if (!Try([&] { queue_.Open(path); })) {
-    WriteLog(ErrorNumber(), "SetOrderList", "Error opening file " + path);
-    return false;
-  }
-  return true;
 }
 
 void CsvOrderImporter::ListTransactions() {
@@ -174,23 +151,17 @@ bool CsvOrderImporter::IsOurs() const {
          line_[OrderField::COMPANYEDIADDR] == Str(Document().CompanyEDIAddr);
 }
 
-void CsvOrderImporter::FillRows(RowTable& rows) const {
-  rows = RowTable(listed_.size(), OrderColumns().size());
-  for (std::size_t row = 0; row < listed_.size(); ++row) {
-    const ListedOrder& entry = listed_[row];
-    rows.At(row, 0) = entry.PONo;
-    if (entry.PODate) rows.At(row, 1) = *entry.PODate;
-    rows.At(row, 2) = entry.InterchangeCtl + "/" + entry.GroupCtl + "/" + entry.TransactionCtl;
-    rows.At(row, 3) = std::string();
-  }
-}
-
 // Reads the order file's next line. False at its end. A line that cannot be read leaves the procedure even when the
 // user says to go on: taken for the end of the file, it would cut an order short.
 bool CsvOrderImporter::ReadLine(Line& line) {
   bool read = false;
-  if (!Try([&] { read = queue_.Lines().Read(line); })) throw ErrorHandling::LeaveProcedure{};
+  if (!Try([&] { read = Lines().Read(line); })) throw ErrorHandling::LeaveProcedure{};
   return read;
+}
+
+LineReader& CsvOrderImporter::Lines() {
+  queue_.File();
+  return *lines_;
 }
 
 void CsvOrderImporter::SetFields(std::string_view aLine, std::vector<std::string>& aFields) const {

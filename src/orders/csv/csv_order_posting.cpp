@@ -12,8 +12,6 @@ namespace {
 
 using enum OrderField;
 
-constexpr std::int32_t kBeingStored = 9;  // Order.Status of an order that isn't complete
-
 template <class R>
 void TakeTexts(const CsvOrderLine& line, std::span<const FieldText<R>> texts, R& record) {
   for (const FieldText<R>& text : texts) {
@@ -26,10 +24,7 @@ void TakeTexts(const CsvOrderLine& line, std::span<const FieldText<R>> texts, R&
 
 CsvOrderImporter::Posting::Posting(CsvOrderImporter& importer, ListedOrder& listed, const PostingValues& postingValues,
                                    ErrorList& errorList)
-    : entry(listed),
-      values(postingValues),
-      log(importer, postingValues.procedure, errorList),
-      checks(importer, log, listed.PONo) {
+    : OrderPosting(importer, listed, postingValues.procedure, errorList), values(postingValues) {
   checks.SetRules(postingValues.checks);
 }
 
@@ -49,23 +44,15 @@ std::int32_t CsvOrderImporter::PostRow(std::int32_t row, const PostingValues* va
     values = &ValuesOf();
   }
   Posting posting(*this, *entry, *values, errorList);
-  if (!BeginPosting(posting) || StartPosting(posting) == Next::kEnd || SettleStoredOrder(posting) == Next::kEnd ||
-      RefuseNewOrder(posting) == Next::kEnd) {
+  const PostingValues& chosen = posting.values;
+  if (!BeginPosting(posting) || StartPosting(posting) == Next::kEnd ||
+      SettleStoredOrder(posting, Facts(posting), chosen.storedOrder, chosen.procedure, chosen.announceStored) ==
+          Next::kEnd ||
+      RefuseNewOrder(posting, Facts(posting), chosen.newOrder) == Next::kEnd) {
     return 0;
   }
   FillHeader(posting);
-  return ReadLines(posting) == Next::kEnd ? 0 : Store(posting);
-}
-
-ListedOrder* CsvOrderImporter::EntryOfRow(std::int32_t row) {
-  ListedOrder* entry = nullptr;
-  Try([&] {
-    if (row < 0 || static_cast<std::size_t>(row) >= listed_.size()) {
-      throw RunTimeError(run_time::kSubscript, "There is no row " + std::to_string(row) + " in the list");
-    }
-    entry = &listed_[static_cast<std::size_t>(row)];
-  });
-  return entry;
+  return ReadLines(posting) == Next::kEnd ? 0 : Store(posting, posting.lineSequence);
 }
 
 // Finds the transaction's first line.
@@ -74,14 +61,9 @@ CsvOrderImporter::Next CsvOrderImporter::StartPosting(Posting& posting) {
 }
 
 bool CsvOrderImporter::SeekTo(const ListedOrder& entry) {
-  const auto position = static_cast<std::uint64_t>(entry.FilePos);
-  return Try([&] {
-    if (queue_.File().Length() < position) {
-      throw RunTimeError(run_time::kPastEnd,
-                         "The order file ends before PO " + entry.PONo + ", at byte " + std::to_string(position));
-    }
-    queue_.Lines().Seek(position);
-  });
+  if (!Reaches(entry)) return false;
+  Lines().Seek(static_cast<std::uint64_t>(entry.FilePos));
+  return true;
 }
 
 OrderFacts CsvOrderImporter::Facts(const Posting& posting) const {
@@ -93,103 +75,12 @@ OrderFacts CsvOrderImporter::Facts(const Posting& posting) const {
   facts.response = line_[RESPONSETYPECODE];
   facts.version = line_[POVERSIONNO];
   facts.directToStore = !accepted && line_[SHIPTOLOCPARTNERNO] == line_[BUYINGLOCPARTNERNO];
+  facts.fileNumber = line_[PONUMBER];
   return facts;
 }
 
-// An order that is already stored under the number.
-CsvOrderImporter::Next CsvOrderImporter::SettleStoredOrder(Posting& posting) {
-  Order stored;
-  stored.VendorId = OwnCompany().VendorId;
-  stored.PartnerId = TradingPartner().PartnerId;
-  stored.PONo = posting.entry.PONo;
-  if (!Try([&] { return Find(Records(), Order::kByNumber, stored); })) return Next::kGoOn;
-
-  OrderFacts facts = Facts(posting);
-  facts.storedType = Str(stored.TypeCode);
-  facts.incomplete = stored.Status == kBeingStored;
-  // The same transaction again. One that an earlier run left half stored is no order yet: it is replaced, for turned
-  // away it would be neither in the store nor in the file.
-  if (ControlsOf(stored) == posting.entry.Controls()) {
-    if (facts.incomplete && !values_.postsWithErrors) {
-      return CarryOut(posting, {.number = kWarning, .message = words::kIncomplete, .fate = Fate::kReplace}, stored);
-    }
-    posting.log.Note(kRejection, words::kAlreadyExists.With(posting.entry.PONo));
-    return TurnAway(posting);
-  }
-  if (!posting.values.announceStored.Empty()) {
-    WriteLog(kWarning, posting.values.procedure, posting.values.announceStored.With(posting.entry.PONo));
-  }
-  facts.hasJobs = HasJobs(stored);
-  const OrderRule* const rule = FirstFitting(posting.values.storedOrder, facts);
-  return rule == nullptr ? Next::kEnd : CarryOut(posting, *rule, stored);
-}
-
-CsvOrderImporter::Next CsvOrderImporter::CarryOut(Posting& posting, const OrderRule& rule, const Order& stored) {
-  NoteRule(posting, rule);
-  const auto deleted = [&] { return DeleteStored(stored); };
-  switch (rule.fate) {
-    case Fate::kTurnAway:
-      return TurnAway(posting);
-    case Fate::kLeaveInFile:
-      return Next::kEnd;
-    case Fate::kReplace:
-      if (!deleted()) return Next::kEnd;
-      processed_.Forget(SettledKey(stored));
-      return Next::kGoOn;
-    case Fate::kCancel:
-      deleted();
-      return MakeDurable() ? TurnAway(posting) : Next::kEnd;
-    case Fate::kCancelIfDeleted:
-      return deleted() && MakeDurable() ? TurnAway(posting) : Next::kEnd;
-    case Fate::kCancelInFile:
-      posting.entry.OrderId = 0;
-      deleted();
-      return Next::kEnd;
-    case Fate::kCancelOrSay:
-      if (deleted()) return MakeDurable() ? TurnAway(posting) : Next::kEnd;
-      posting.log.Note(kWarning, words::kCancelFailed.With(posting.entry.PONo));
-      return Next::kEnd;
-  }
-  return Next::kEnd;
-}
-
-// A cancellation is durable before its order counts as done: a later failure of the store must not bring the order
-// back.
-bool CsvOrderImporter::MakeDurable() {
-  return Try([&] { Host().Commit(0); });
-}
-
-// False when the host says no. A store that fails is a fault: what was to be cancelled or replaced must come up again.
-bool CsvOrderImporter::DeleteStored(const Order& stored) {
-  return Try([&] {
-    if (Host().DeleteOrder(stored)) return true;
-    if (Records().NativeError() == 0) return false;
-    throw RunTimeError(run_time::kDatabase, "The stored PO " + stored.PONo + " cannot be deleted");
-  });
-}
-
-bool CsvOrderImporter::HasJobs(const Order& stored) {
-  Job probe;
-  probe.OrderId = stored.OrderId;
-  return Try([&] { return Count(Records(), Job::kByOrder, probe); }) > 0;
-}
-
-// An order whose number isn't stored, or no longer, may still be none to post.
-CsvOrderImporter::Next CsvOrderImporter::RefuseNewOrder(Posting& posting) {
-  const OrderRule* const rule = FirstFitting(posting.values.newOrder, Facts(posting));
-  if (rule == nullptr) return Next::kGoOn;
-  NoteRule(posting, *rule);
-  return rule->fate == Fate::kTurnAway ? TurnAway(posting) : Next::kEnd;
-}
-
-void CsvOrderImporter::NoteRule(Posting& posting, const OrderRule& rule) {
-  posting.log.Note(rule.number, rule.message.With(rule.fileNumber ? line_[PONUMBER] : posting.entry.PONo));
-}
-
-CsvOrderImporter::Next CsvOrderImporter::TurnAway(Posting& posting) {
-  posting.entry.OrderId = 0;
-  if (!values_.keepsTurnedAway) MarkProcessed(posting.entry);
-  return Next::kEnd;
+void CsvOrderImporter::MarkTurnedAway(ListedOrder& entry) {
+  if (!values_.keepsTurnedAway) MarkPosted(entry);
 }
 
 void CsvOrderImporter::FillHeader(Posting& posting) {
@@ -335,43 +226,21 @@ void CsvOrderImporter::CheckLineLocations(Posting& posting) {
   CheckBuyingLocn(posting);
 }
 
-// A location is looked at when it changes from one line to the next.
-void CsvOrderImporter::CheckShipTo(Posting& posting, std::string_view wanted) {
-  if (!posting.shipTo.empty() && posting.shipTo == wanted) return;
-  posting.shipTo = wanted;
-  posting.locationLookedAt = wanted;
-  posting.checks.CheckLocation("ship to", wanted);
-}
-
 void CsvOrderImporter::CheckBuyingLocn(Posting& posting) {
-  const std::string_view wanted = BuyingLocn();
-  if (!posting.buyingLocn.empty() && posting.buyingLocn == wanted) return;
-  posting.buyingLocn = wanted;
-  if (!posting.values.checksBuyingLocn || posting.locationLookedAt == wanted) return;
-  posting.locationLookedAt = wanted;
-  posting.checks.CheckLocation("buying", wanted);
+  OrderImporter::CheckBuyingLocn(posting, BuyingLocn(), posting.values.checksBuyingLocn);
 }
 
 void CsvOrderImporter::TakeLocation(Posting& posting) {
-  if (posting.draft.locations.Find(posting.buyingLocn)) return;
-  const auto added = std::make_shared<OrderLocn>();
-  added->VendorId = OwnCompany().VendorId;
-  added->ShipToLocn = posting.shipTo;
-  added->BuyingLocn = posting.buyingLocn;
+  OrderLocn* const added = NewLocation(posting);
+  if (added == nullptr) return;
   added->CustomerRef = NullIfEmpty(line_[CUSTOMERREF]);
   added->CustomerNo = NullIfEmpty(line_[CUSTOMERNO]);
-  posting.draft.locations.Add(added, posting.buyingLocn);
 }
 
 CsvOrderImporter::Next CsvOrderImporter::AddToLocation(Posting& posting, const LineProduct& product) {
   const std::string key = OrderDraft::LocnLineKey(posting.buyingLocn, product.ordered);
   const auto& there = posting.draft.locnLines.Find(key);
-  if (there && !posting.values.repeatsAddUp) {
-    posting.entry.OrderId = 0;
-    posting.log.Note(ErrorNumber(),
-                     "Duplicate lines found for store " + posting.buyingLocn + " EAN " + product.ordered);
-    return Next::kEnd;
-  }
+  if (there && !posting.values.repeatsAddUp) return RejectRepeat(posting, product.ordered);
   const auto added = std::make_shared<OrderLocnLine>();
   added->ProductNo = product.productNo;
   added->GTIN = product.GTIN;
@@ -390,23 +259,6 @@ void CsvOrderImporter::FillLocationLine(const Posting& posting, OrderLocnLine& l
   locnLine.Quantity = LineQuantity(posting);
   locnLine.AllocateQty = line_[ALLOCATEQUANTITY].empty() ? locnLine.Quantity : NumberOf(ALLOCATEQUANTITY);
   locnLine.LineRef = NullIfEmpty(line_[LINEREF]);
-}
-
-// Stores the order when every check passed, and tells the outcome. The stored order's id, 0 when nothing was posted.
-std::int32_t CsvOrderImporter::Store(Posting& posting) {
-  ListedOrder& entry = posting.entry;
-  if (!posting.checks.Ok()) {
-    posting.log.Note(kInformation, words::kImportIncomplete.With(entry.PONo));
-    return 0;
-  }
-  entry.OrderId = 0;
-  if (!StoreDraft(*this, posting.log, posting.draft, posting.lineSequence)) return 0;
-  const bool complete = !posting.checks.PassedWithErrors();
-  if (!orders::MakeDurable(*this, posting.draft, complete)) return 0;
-  entry.OrderId = posting.draft.header.OrderId;
-  MarkProcessed(entry);
-  posting.log.Note(kInformation, (complete ? words::kImportCompleted : words::kImportWithErrors).With(entry.PONo));
-  return complete ? entry.OrderId : 0;
 }
 
 }  // namespace partnerkit::orders

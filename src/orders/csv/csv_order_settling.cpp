@@ -9,14 +9,6 @@ namespace {
 
 constexpr OrderField kAddresses[] = {OrderField::PARTNEREDIADDR, OrderField::COMPANYEDIADDR};
 
-constexpr std::string_view kDeleteOnEmpty = "#%DELETEONEMPTY";
-
-// Segments of an interchange that some mailboxes leave between the lines.
-bool IsEnvelope(std::string_view line) {
-  constexpr std::string_view kTags[] = {"ISA", "GS*", "ST*", "IEA", "GE*", "SE*", "UNB", "UNH", "UNT", "UNZ"};
-  return std::ranges::find(kTags, line.substr(0, 3)) != std::end(kTags);
-}
-
 // Adds a line to the ranges; lines that follow each other make one range.
 void Extend(std::vector<ByteRange>& ranges, const Line& line) {
   if (!ranges.empty() && ranges.back().end == line.position) {
@@ -37,9 +29,9 @@ bool CsvOrderImporter::Term() {
       Try([&] { Host().Commit(0); });
       if (!SettleFile()) return;
     }
-    queue_.Close();
+    CloseOrderFile();
     Try([&] { backup_.Close(); });
-    DeleteWhenEmpty();
+    DeleteWhenEmpty(values_.deleteOnEmptyAnywhere);
     done = true;
   });
 }
@@ -66,7 +58,7 @@ void CsvOrderImporter::DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRang
   const std::size_t controls = values_.settlesByControls ? line_.ColumnsFor(values_.transactionKey) : 0;
   std::string key, number, lastKey;
   std::optional<std::int32_t> outcome = processed_.Find(lastKey);
-  LineReader& lines = queue_.Lines();
+  LineReader& lines = Lines();
   lines.Seek(1);
   do {
     for (Line line; lines.Read(line);) {
@@ -78,7 +70,7 @@ void CsvOrderImporter::DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRang
         outcome = processed_.Find(key);
       }
       if (!outcome || (values_.keepsForeignLines && !IsOurs())) {
-        rewrite.Keep(line);
+        rewrite.Keep(line.raw);
       } else if (*outcome > 0) {
         Extend(posted, line);
       }
@@ -104,19 +96,7 @@ std::string CsvOrderImporter::SettledKey(const Order& stored) const {
   return values_.settlesByControls ? stored.PONo + '\0' + ControlsOf(stored) : stored.PONo;
 }
 
-void CsvOrderImporter::MarkProcessed(const ListedOrder& entry) { processed_.Add(SettledKey(entry), entry.OrderId); }
-
-void CsvOrderImporter::DeleteWhenEmpty() {
-  const std::string_view options = Str(Document().Options);
-  if (values_.deleteOnEmptyAnywhere ? options.find(kDeleteOnEmpty) == std::string_view::npos
-                                    : options != kDeleteOnEmpty) {
-    return;
-  }
-  const HandlerOff off(Errors());
-  Try([&] {
-    if (FileSystem().Length(fileName_) == 0) FileSystem().Delete(fileName_);
-  });
-}
+void CsvOrderImporter::MarkPosted(ListedOrder& entry) { processed_.Add(SettledKey(entry), entry.OrderId); }
 
 bool CsvOrderImporter::Delete(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
   return Procedure("Function Delete", false, [&](bool& done) {
@@ -124,19 +104,15 @@ bool CsvOrderImporter::Delete(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
     const ListedOrder* const entry = EntryOfRow(a_lRowNum);
     if (entry == nullptr) return;
     const auto begin = static_cast<std::uint64_t>(entry->FilePos);
-    std::uint64_t end = 0;
-    if (entry != &listed_.back()) {
-      end = static_cast<std::uint64_t>(entry[1].FilePos);
-    } else if (!Try([&] { end = queue_.File().Length() + 1; })) {
-      return;
-    }
+    const auto end = EndOf(*entry);
+    if (!end) return;
     WorkQueue::Rewrite rewrite(queue_);
-    if (!Try([&] { CopyAllBut(rewrite, begin, end); }) || !Try([&] { rewrite.Claim(); }) ||
+    if (!Try([&] { CopyAllBut(rewrite, begin, *end); }) || !Try([&] { rewrite.Claim(); }) ||
         !Try([&] { rewrite.Replace(); })) {
       return;
     }
-    queue_.Close();
-    DeleteWhenEmpty();
+    CloseOrderFile();
+    DeleteWhenEmpty(values_.deleteOnEmptyAnywhere);
     log.Note(kInformation, "Transaction deleted from file.");
     done = true;
   });
@@ -145,20 +121,26 @@ bool CsvOrderImporter::Delete(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
 // A line of the transaction is any that ends behind its begin and not beyond its end.
 void CsvOrderImporter::CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t begin, std::uint64_t end) {
   rewrite.Begin();
-  LineReader& lines = queue_.Lines();
+  LineReader& lines = Lines();
   lines.Seek(1);
   for (Line line; lines.Read(line);) {
     const bool inside = line.End() > begin && line.End() <= end;
-    if (!inside || (!values_.deletesEnvelopes && IsEnvelope(line.text))) rewrite.Keep(line);
+    // Some mailboxes leave segments of an interchange between the lines.
+    if (!inside || (!values_.deletesEnvelopes && IsEnvelopeSegment(line.text))) rewrite.Keep(line.raw);
   }
   rewrite.Finish();
 }
 
 void CsvOrderImporter::Cancel() {
   Procedure("Sub Cancel", false, [&](bool&) {
-    queue_.Close();
+    CloseOrderFile();
     Try([&] { backup_.Close(); });
   });
+}
+
+void CsvOrderImporter::CloseOrderFile() {
+  lines_.reset();
+  queue_.Close();
 }
 
 }  // namespace partnerkit::orders

@@ -111,7 +111,6 @@ struct CsvOrderValues {
   bool endsAtOtherCompany = false;   // a line for another company ends the transaction
 
   PostingValues posting = {};
-  bool postsWithErrors = false;  // an order may be stored whole and yet stay at Status 9, for its faults to be settled
 
   // Settling.
   bool keepsForeignLines = false;      // lines of other addresses stay, whatever their number

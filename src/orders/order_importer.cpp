@@ -1,0 +1,255 @@
+#include "orders/order_importer.h"
+
+#include <algorithm>
+
+#include "orders/order_columns.h"
+#include "orders/order_store.h"
+
+namespace partnerkit::orders {
+
+namespace {
+
+constexpr std::string_view kDeleteOnEmpty = "#%DELETEONEMPTY";
+
+}  // namespace
+
+bool IsEnvelopeSegment(std::string_view text) {
+  constexpr std::string_view kTags[] = {"ISA", "GS*", "ST*", "IEA", "GE*", "SE*", "UNB", "UNH", "UNT", "UNZ"};
+  return std::ranges::find(kTags, text.substr(0, 3)) != std::end(kTags);
+}
+
+bool OrderImporter::FindOrderFile(const std::string& path) {
+  const HandlerOff off(Errors());
+  std::uint64_t length = 0;
+  if (!Try([&] { length = FileSystem().Length(path); })) {
+    WriteLog(ErrorNumber(), "SetOrderList", "File " + path + " does not exist.");
+    return false;
+  }
+  if (length == 0) {
+    WriteLog(ErrorNumber(), "SetOrderList", "File " + path + " is empty.");
+    return false;
+  }
+  return true;
+}
+
+bool OrderImporter::HoldOrderFile(const std::string& path) {
+  const HandlerOff off(Errors());
+  if (Try([&] { queue_.Open(path); })) return true;
+  WriteLog(ErrorNumber(), "SetOrderList", "Error opening file " + path);
+  return false;
+}
+
+std::int32_t OrderImporter::ShowRows(RowTable& rows) {
+  if (listed_.empty()) {
+    WriteLog(ErrorNumber(), "Load", "No orders found to match EDI addresses.");
+    return 0;
+  }
+  rows = RowTable(listed_.size(), OrderColumns().size());
+  for (std::size_t row = 0; row < listed_.size(); ++row) {
+    const ListedOrder& entry = listed_[row];
+    rows.At(row, 0) = entry.PONo;
+    if (entry.PODate) rows.At(row, 1) = *entry.PODate;
+    rows.At(row, 2) = entry.InterchangeCtl + "/" + entry.GroupCtl + "/" + entry.TransactionCtl;
+    rows.At(row, 3) = std::string();
+  }
+  return static_cast<std::int32_t>(listed_.size());
+}
+
+ListedOrder* OrderImporter::EntryOfRow(std::int32_t row) {
+  ListedOrder* entry = nullptr;
+  Try([&] {
+    if (row < 0 || static_cast<std::size_t>(row) >= listed_.size()) {
+      throw RunTimeError(run_time::kSubscript, "There is no row " + std::to_string(row) + " in the list");
+    }
+    entry = &listed_[static_cast<std::size_t>(row)];
+  });
+  return entry;
+}
+
+bool OrderImporter::Reaches(const ListedOrder& entry) {
+  const auto position = static_cast<std::uint64_t>(entry.FilePos);
+  return Try([&] {
+    if (queue_.File().Length() >= position) return;
+    throw RunTimeError(run_time::kPastEnd,
+                       "The order file ends before PO " + entry.PONo + ", at byte " + std::to_string(position));
+  });
+}
+
+std::optional<std::uint64_t> OrderImporter::EndOf(const ListedOrder& entry) {
+  if (&entry != &listed_.back()) return static_cast<std::uint64_t>((&entry)[1].FilePos);
+  return Try([&] { return std::optional(queue_.File().Length() + 1); });
+}
+
+void OrderImporter::DeleteWhenEmpty(bool optionAnywhere) {
+  const std::string_view options = Str(Document().Options);
+  if (optionAnywhere ? options.find(kDeleteOnEmpty) == std::string_view::npos : options != kDeleteOnEmpty) return;
+  const HandlerOff off(Errors());
+  Try([&] {
+    if (FileSystem().Length(fileName_) == 0) FileSystem().Delete(fileName_);
+  });
+}
+
+OrderImporter::Next OrderImporter::SettleStoredOrder(OrderPosting& posting, OrderFacts facts,
+                                                     std::span<const OrderRule> rules, std::string_view procedure,
+                                                     const Words& announce) {
+  Order stored;
+  stored.VendorId = OwnCompany().VendorId;
+  stored.PartnerId = TradingPartner().PartnerId;
+  stored.PONo = posting.entry.PONo;
+  if (!Try([&] { return Find(Records(), Order::kByNumber, stored); })) return Next::kGoOn;
+
+  facts.storedType = Str(stored.TypeCode);
+  facts.storedChangeFlag = Str(stored.ChangeFlag);
+  facts.incomplete = stored.Status == kBeingStored;
+  // The same transaction again. One that an earlier run left half stored is no order yet: it is replaced, for turned
+  // away it would be neither in the store nor in the file. One stored with its faults looks like it, and is an order.
+  if (SameTransaction(stored, posting.entry)) {
+    if (facts.incomplete && !posting.checks.FaultsPass()) {
+      return CarryOut(posting, {.number = kWarning, .message = words::kIncomplete, .fate = Fate::kReplace}, facts,
+                      stored);
+    }
+    posting.log.Note(kRejection, words::kAlreadyExists.With(posting.entry.PONo));
+    return TurnAway(posting);
+  }
+  if (!announce.Empty()) WriteLog(kWarning, procedure, announce.With(posting.entry.PONo));
+  facts.hasJobs = HasJobs(stored);
+  const OrderRule* const rule = FirstFitting(rules, facts);
+  return rule == nullptr ? Next::kEnd : CarryOut(posting, *rule, facts, stored);
+}
+
+bool OrderImporter::SameTransaction(const Order& stored, const ListedOrder& entry) const {
+  return ControlsOf(stored) == entry.Controls();
+}
+
+OrderImporter::Next OrderImporter::CarryOut(OrderPosting& posting, const OrderRule& rule, const OrderFacts& facts,
+                                            Order& stored) {
+  const std::string_view number = rule.fileNumber ? facts.fileNumber : posting.entry.PONo;
+  const auto note = [&](const Words& message) {
+    if (!message.Empty()) posting.log.Note(rule.number, message.With(number));
+  };
+  const auto deleted = [&] {
+    if (DeleteStored(stored)) return posting.deletedStored = true;
+    note(rule.refused);
+    return false;
+  };
+  if (rule.fate != Fate::kCancelThenSay) note(rule.message);
+  switch (rule.fate) {
+    case Fate::kTurnAway:
+      return TurnAway(posting);
+    case Fate::kLeaveInFile:
+    case Fate::kGoOn:
+      return Next::kEnd;
+    case Fate::kReplace:
+      if (!deleted()) return Next::kEnd;
+      Forget(stored);
+      return Next::kGoOn;
+    case Fate::kCancel:
+      deleted();
+      return TurnAway(posting);
+    case Fate::kCancelIfDeleted:
+      return deleted() ? TurnAway(posting) : Next::kEnd;
+    case Fate::kCancelInFile:
+      posting.entry.OrderId = 0;
+      deleted();
+      return Next::kEnd;
+    case Fate::kCancelThenSay:
+      if (!deleted()) return TurnAway(posting);
+      if (!MakeDurable()) return Next::kEnd;
+      note(rule.message);
+      posting.result = stored.OrderId;
+      return Next::kEnd;
+    case Fate::kChangeStored:
+      return ChangeStored(posting, stored);
+  }
+  return Next::kEnd;
+}
+
+// The deletion of a stored order is durable before the one that asked for it counts as done: a later failure of the
+// store must not bring it back.
+OrderImporter::Next OrderImporter::TurnAway(OrderPosting& posting) {
+  if (posting.deletedStored && !MakeDurable()) return Next::kEnd;
+  posting.entry.OrderId = 0;
+  MarkTurnedAway(posting.entry);
+  return Next::kEnd;
+}
+
+bool OrderImporter::MakeDurable() {
+  return Try([&] { Host().Commit(0); });
+}
+
+// False when the host says no. A store that fails is a fault: what was to be cancelled or replaced must come up again.
+bool OrderImporter::DeleteStored(const Order& stored) {
+  return Try([&] {
+    if (Host().DeleteOrder(stored)) return true;
+    if (Records().NativeError() == 0) return false;
+    throw RunTimeError(run_time::kDatabase, "The stored PO " + stored.PONo + " cannot be deleted");
+  });
+}
+
+bool OrderImporter::HasJobs(const Order& stored) {
+  Job probe;
+  probe.OrderId = stored.OrderId;
+  return Try([&] { return Count(Records(), Job::kByOrder, probe); }) > 0;
+}
+
+OrderImporter::Next OrderImporter::RefuseNewOrder(OrderPosting& posting, const OrderFacts& facts,
+                                                  std::span<const OrderRule> rules) {
+  while (const OrderRule* const rule = FirstFitting(rules, facts)) {
+    posting.log.Note(rule->number, rule->message.With(rule->fileNumber ? facts.fileNumber : posting.entry.PONo));
+    if (rule->fate != Fate::kGoOn) return rule->fate == Fate::kTurnAway ? TurnAway(posting) : Next::kEnd;
+    rules = rules.subspan(static_cast<std::size_t>(rule - rules.data()) + 1);
+  }
+  return Next::kGoOn;
+}
+
+void OrderImporter::CheckShipTo(OrderPosting& posting, std::string_view wanted) {
+  if (!posting.shipTo.empty() && posting.shipTo == wanted) return;
+  posting.shipTo = wanted;
+  posting.locationLookedAt = wanted;
+  posting.checks.CheckLocation("ship to", wanted);
+}
+
+void OrderImporter::CheckBuyingLocn(OrderPosting& posting, std::string_view wanted, bool looksItUp,
+                                    std::string_view what) {
+  if (!posting.buyingLocn.empty() && posting.buyingLocn == wanted) return;
+  posting.buyingLocn = wanted;
+  if (!looksItUp || posting.locationLookedAt == wanted) return;
+  posting.locationLookedAt = wanted;
+  posting.checks.CheckLocation(what, wanted);
+}
+
+OrderLocn* OrderImporter::NewLocation(OrderPosting& posting) {
+  if (posting.draft.locations.Find(posting.buyingLocn)) return nullptr;
+  const auto added = std::make_shared<OrderLocn>();
+  added->VendorId = OwnCompany().VendorId;
+  added->ShipToLocn = posting.shipTo;
+  added->BuyingLocn = posting.buyingLocn;
+  posting.draft.locations.Add(added, posting.buyingLocn);
+  return added.get();
+}
+
+OrderImporter::Next OrderImporter::RejectRepeat(OrderPosting& posting, std::string_view ordered) {
+  posting.entry.OrderId = 0;
+  posting.log.Note(ErrorNumber(),
+                   "Duplicate lines found for store " + posting.buyingLocn + " EAN " + std::string(ordered));
+  return Next::kEnd;
+}
+
+std::int32_t OrderImporter::Store(OrderPosting& posting, std::optional<std::string_view> lineSequence) {
+  ListedOrder& entry = posting.entry;
+  if (!posting.checks.Ok() || !posting.complete) {
+    posting.log.Note(kInformation, words::kImportIncomplete.With(entry.PONo));
+    return 0;
+  }
+  entry.OrderId = 0;
+  if (!StoreDraft(*this, posting.log, posting.draft, lineSequence)) return 0;
+  const bool complete = !posting.checks.PassedWithErrors();
+  if (!orders::MakeDurable(*this, posting.draft, complete)) return 0;
+  entry.OrderId = posting.draft.header.OrderId;
+  MarkPosted(entry);
+  Export(posting);
+  posting.log.Note(kInformation, (complete ? words::kImportCompleted : words::kImportWithErrors).With(entry.PONo));
+  return complete ? entry.OrderId : 0;
+}
+
+}  // namespace partnerkit::orders
