@@ -37,6 +37,8 @@ class MemoryFiles : public Files {
     Named(path);
     names_.erase(path);
   }
+  void CreateFolder(const std::string&) override {}
+  void Copy(const std::string& from, const std::string& to) override { Put(to, Bytes(from)); }
   void Rename(const std::string& from, const std::string& to) override {
     const auto file = Named(from);
     names_.erase(from);

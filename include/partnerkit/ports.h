@@ -9,6 +9,7 @@
 #include <string>
 #include <string_view>
 
+#include "partnerkit/components.h"
 #include "partnerkit/run_time_error.h"
 #include "partnerkit/values.h"
 
@@ -65,6 +66,10 @@ class Files {
   virtual void Delete(const std::string& path) = 0;
   // Gives `from` the name `to` in one step, in the place of a file that has it; durable when it returns.
   virtual void Rename(const std::string& from, const std::string& to) = 0;
+  // Makes the last folder of the path. Raises for one that is there.
+  virtual void CreateFolder(const std::string& path) = 0;
+  // Copies a file, in the place of one that has the name `to`. What is there under that name is whole at any moment.
+  virtual void Copy(const std::string& from, const std::string& to) = 0;
 };
 
 class Clock {
@@ -113,6 +118,7 @@ struct Ports {
   Clock* clock = nullptr;
   // The computer's name; nothing when the platform cannot tell.
   std::function<std::optional<std::string>()> computerName;
+  ComponentFactory components;
   ErrorOutlets errorOutlets;
   ErrorSettings errorSettings;
 };

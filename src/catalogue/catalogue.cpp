@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "orders/csv/csv_classes.h"
+#include "orders/x12/x12_classes.h"
 
 namespace partnerkit {
 
@@ -25,6 +26,10 @@ constexpr PublicClass kClasses[] = {
     {"PartnerKit.clsColesEIDCPOcsv",      "Purchase order (850)", "in", "CSV", Make<orders::clsColesEIDCPOcsv>},
     {"PartnerKit.clsMYERDropShipPOcsv",   "Purchase order (850)", "in", "CSV", Make<orders::clsMYERDropShipPOcsv>},
     {"PartnerKit.clsTargetBulkPOcsv",     "Purchase order (850)", "in", "CSV", Make<orders::clsTargetBulkPOcsv>},
+    {"PartnerKit.clsMGB850ansix12",       "Purchase order (850)", "in", "ANSI X12", Make<orders::clsMGB850ansix12>},
+    {"PartnerKit.clsTarget850ansix12",    "Purchase order (850)", "in", "ANSI X12", Make<orders::clsTarget850ansix12>},
+    {"PartnerKit.clsGHPL850ansix12",      "Purchase order (850)", "in", "ANSI X12", Make<orders::clsGHPL850ansix12>},
+    {"PartnerKit.clsKMart850ansix12",     "Purchase order (850, 860)", "in", "ANSI X12", Make<orders::clsKMart850ansix12>},
 };
 // clang-format on
 

@@ -43,6 +43,8 @@ class ProgressFiles : public Files {
   }
   void Delete(const std::string& path) override { files_.Delete(path); }
   void Rename(const std::string& from, const std::string& to) override { files_.Rename(from, to); }
+  void CreateFolder(const std::string& path) override { files_.CreateFolder(path); }
+  void Copy(const std::string& from, const std::string& to) override { files_.Copy(from, to); }
   // What the reading is for: "listing", "settling".
   void SetPurpose(std::string_view purpose) { purpose_ = purpose; }
 

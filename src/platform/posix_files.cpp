@@ -141,10 +141,16 @@ struct stat StatusOf(int descriptor, const std::string& native) {
   return status;
 }
 
-bool Names(const std::string& native, const struct stat& held) {
+// Whether a file has that name, and is the one held.
+bool FileIs(const std::string& native, const struct stat& held) {
   struct stat named {};
-  if (stat(native.c_str(), &named) == 0) return named.st_dev == held.st_dev && named.st_ino == held.st_ino;
-  if (errno == ENOENT || errno == ENOTDIR) return false;
+  return stat(native.c_str(), &named) == 0 && named.st_dev == held.st_dev && named.st_ino == held.st_ino;
+}
+
+bool Names(const std::string& native, const struct stat& held) {
+  if (FileIs(native, held)) return true;
+  struct stat named {};
+  if (stat(native.c_str(), &named) == 0 || errno == ENOENT || errno == ENOTDIR) return false;
   RaiseCause(errno, native, run_time::kPathAccess);
 }
 
@@ -236,6 +242,29 @@ class FolderOf {
   std::string path_;
   Descriptor opened_;
 };
+
+// Inside the system as far as the file systems allow. The cause of a failure, 0 when there is none.
+int CopyBytes(int from, int to) {
+  for (;;) {
+    const ssize_t count =
+        Uninterrupted([&] { return copy_file_range(from, nullptr, to, nullptr, std::size_t{1} << 30, 0); });
+    if (count == 0) return 0;
+    if (count > 0) continue;
+    if (errno != EXDEV && errno != ENOSYS && errno != EINVAL && errno != EOPNOTSUPP) return errno;
+    break;
+  }
+  std::string block(kWriteBuffer, '\0');
+  for (;;) {
+    const ssize_t count = Uninterrupted([&] { return ::read(from, block.data(), block.size()); });
+    if (count <= 0) return count == 0 ? 0 : errno;
+    for (ssize_t done = 0; done < count;) {
+      const ssize_t written =
+          Uninterrupted([&] { return ::write(to, block.data() + done, static_cast<std::size_t>(count - done)); });
+      if (written <= 0) return written == 0 ? EIO : errno;
+      done += written;
+    }
+  }
+}
 
 class PosixInput : public InputFile {
  public:
@@ -434,6 +463,29 @@ void PosixFiles::Rename(const std::string& from, const std::string& to) {
   }
   newFolder.Sync();
   if (oldFolder.Path() != newFolder.Path()) oldFolder.Sync();
+}
+
+void PosixFiles::CreateFolder(const std::string& path) {
+  const std::string native = Checked(path);
+  if (::mkdir(native.c_str(), 0777) != 0) RaiseCause(errno, native, run_time::kPathAccess);
+}
+
+void PosixFiles::Copy(const std::string& from, const std::string& to) {
+  const std::string source = Checked(from), target = Checked(to), draft = target + ".tmp";
+  const Descriptor in(Uninterrupted([&] { return ::open(source.c_str(), O_RDONLY | kOpenFlags); }));
+  if (!in.IsOpen()) RaiseCause(errno, source, run_time::kPathAccess);
+  const struct stat status = StatusOf(in.Number(), source);
+  if (!S_ISREG(status.st_mode)) RaiseCause(EISDIR, source, run_time::kPathAccess);
+  if (FileIs(target, status)) Raise(run_time::kPathAccess, target, "A file cannot be copied onto itself");
+  Descriptor out(Uninterrupted(
+      [&] { return ::open(draft.c_str(), O_WRONLY | O_CREAT | O_TRUNC | kOpenFlags, status.st_mode & 0777); }));
+  if (!out.IsOpen()) RaiseCause(errno, draft, run_time::kPathAccess);
+  int failure = CopyBytes(in.Number(), out.Number());
+  if (const int cause = out.Close(); failure == 0) failure = cause;
+  if (failure == 0 && std::rename(draft.c_str(), target.c_str()) != 0) failure = errno;
+  if (failure == 0) return;
+  ::unlink(draft.c_str());
+  RaiseCause(failure, target, run_time::kDeviceError);
 }
 
 }  // namespace partnerkit::platform

@@ -25,6 +25,9 @@ class PosixFiles : public Files {
   // Removes the name also while a program holds the file.
   void Delete(const std::string& path) override;
   void Rename(const std::string& from, const std::string& to) override;
+  void CreateFolder(const std::string& path) override;
+  // By way of the name `to` and ".tmp". The copy isn't brought to the disk at once.
+  void Copy(const std::string& from, const std::string& to) override;
 };
 
 }  // namespace partnerkit::platform

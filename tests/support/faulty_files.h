@@ -14,7 +14,7 @@ class FaultyFiles : public Files {
   explicit FaultyFiles(Files& real) : real_(real) {}
 
   // After `passed` good ones, the next `times` operations `what` ("Length", "OpenInput", "OpenOutput", "Delete",
-  // "Rename", "Read", "Write" or "Sync") on a file whose path ends in `name` raise `number`.
+  // "Rename", "Copy", "Read", "Write" or "Sync") on a file whose path ends in `name` raise `number`.
   void Fail(std::string what, std::string name, std::int32_t number, int times = 1, int passed = 0) {
     fault_ = {std::move(what), std::move(name), number, times, passed};
   }
@@ -31,6 +31,8 @@ class FaultyFiles : public Files {
   }
   void Delete(const std::string& path) override { Check("Delete", path), real_.Delete(path); }
   void Rename(const std::string& from, const std::string& to) override { Check("Rename", to), real_.Rename(from, to); }
+  void CreateFolder(const std::string& path) override { real_.CreateFolder(path); }
+  void Copy(const std::string& from, const std::string& to) override { Check("Copy", to), real_.Copy(from, to); }
 
  private:
   struct Fault {

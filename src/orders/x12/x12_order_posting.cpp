@@ -1,0 +1,155 @@
+// Posting one transaction of an X12 order file.
+#include <algorithm>
+
+#include "frame/delimited.h"
+#include "frame/numbers.h"
+#include "orders/order_export.h"
+#include "orders/order_store.h"
+#include "orders/x12/x12_order_importer.h"
+
+namespace partnerkit::orders {
+
+std::int32_t X12OrderImporter::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
+  return Procedure("Function Process", std::int32_t{0}, [&](std::int32_t& orderId) {
+    ListedOrder* const entry = EntryOfRow(a_lRowNum);
+    if (entry == nullptr || !Reaches(*entry)) return;
+    Posting posting(*this, *entry, "Process", vtErrorLog);
+    posting.complete = false;
+    posting.checks.SetRules(values_.checks);
+    BeginPosting(posting);
+    Segments().Seek(static_cast<std::uint64_t>(entry->FilePos));
+    if (ReadTransaction(posting) == Next::kEnd) {
+      orderId = posting.result;
+      return;
+    }
+    if (values_.datesDefaultToToday) {
+      Order& header = posting.draft.header;
+      if (!header.CancelAfter) header.CancelAfter = Now().Date();
+      if (!header.NotBefore) header.NotBefore = Now().Date();
+    }
+    orderId = Store(posting);
+  });
+}
+
+// Reads and checks the transaction's segments. Nothing is stored here: an order goes in whole or not at all. A
+// transaction without its CTT was cut short; what stands behind its SE is never taken for a part of it.
+X12OrderImporter::Next X12OrderImporter::ReadTransaction(Posting& posting) {
+  while (NextSegment()) {
+    const std::string_view tag = segment_.Text().substr(0, 3);
+    Next next = Next::kGoOn;
+    if (IsOneOf(tag, values_.beginnings)) {
+      if (posting.begun) break;
+      next = TakeBeginning(posting);
+    } else if (tag == "CTT") {
+      posting.complete = true;
+      return Distribute(posting);
+    } else if (tag == "SE*") {
+      break;
+    } else if (tag == "DTM") {
+      TakeDate(posting.draft.header);
+    } else if (tag == "N1*") {
+      TakeN1(posting);
+    } else if (tag == "SDQ") {
+      next = TakeStores(posting);
+    } else if (const auto line = std::ranges::find(values_.lines, tag, &LineElements::tag);
+               line != values_.lines.end()) {
+      next = TakeLine(posting, *line);
+    } else if (tag == "CTP") {
+      TakeRetail(posting);
+    } else if (tag == "PO4") {
+      TakePack(posting);
+    } else {
+      ReadOther(posting);
+    }
+    if (next == Next::kEnd) return Next::kEnd;
+  }
+  return Next::kGoOn;
+}
+
+X12OrderImporter::Next X12OrderImporter::TakeBeginning(Posting& posting) {
+  posting.begun = true;
+  const std::string purpose = Element(1), type = Element(2);
+  OrderFacts facts;
+  facts.purpose = purpose;
+  facts.type = type;
+  if (SettleStoredOrder(posting, facts, values_.storedOrder, "Process") == Next::kEnd ||
+      RefuseNewOrder(posting, facts, values_.newOrder) == Next::kEnd) {
+    return Next::kEnd;
+  }
+  FillHeader(posting);
+  posting.draft.header.PurposeCode = purpose;
+  posting.draft.header.TypeCode = type;
+  return Next::kGoOn;
+}
+
+bool X12OrderImporter::SameTransaction(const Order& stored, const ListedOrder& entry) const {
+  return Str(stored.InterchangeCtl) == entry.InterchangeCtl && Str(stored.GroupCtl) == entry.GroupCtl &&
+         Str(stored.TransactionCtl) == entry.TransactionCtl;
+}
+
+void X12OrderImporter::FillHeader(Posting& posting) {
+  const ListedOrder& entry = posting.entry;
+  Order& header = posting.draft.header;
+  header.VendorId = OwnCompany().VendorId;
+  header.PartnerId = TradingPartner().PartnerId;
+  header.InterchangeCtl = entry.InterchangeCtl;
+  header.GroupCtl = entry.GroupCtl;
+  header.TransactionCtl = entry.TransactionCtl;
+  if (values_.keepsSourceFile) header.SourceFile = fileName_;
+  header.FilePos = entry.FilePos;
+  header.PONo = entry.PONo;
+  header.PODate = entry.PODate;
+  header.ImportDate = Now().Date();
+  header.Status = kBeingStored;
+}
+
+// The qualifier and the date stand at fixed positions.
+void X12OrderImporter::TakeDate(Order& order) {
+  for (const DateOfOrder& date : values_.dates) {
+    if (segment_.Fixed(5, 3) == date.qualifier) order.*date.member = segment_.FixedDate(9);
+  }
+}
+
+// Only the dates of an order in work can still be changed.
+X12OrderImporter::Next X12OrderImporter::ChangeStored(OrderPosting& posting, Order& stored) {
+  while (NextSegment()) {
+    if (segment_.Begins("SE*")) break;
+    if (segment_.Begins("DTM")) TakeDate(stored);
+    if (!segment_.Begins("CTT")) continue;
+    const bool changed = Try([&] {
+      if (Update(Records(), stored)) return true;
+      if (Records().NativeError() == 0) return false;
+      throw RunTimeError(run_time::kDatabase, "The stored PO " + stored.PONo + " cannot be changed");
+    });
+    if (changed && !MakeDurable()) return Next::kEnd;
+    posting.log.Note(kWarning, (changed ? words::kChange : words::kChangeFailed).With(posting.entry.PONo));
+    if (changed) posting.result = stored.OrderId;
+    return TurnAway(posting);
+  }
+  return Next::kEnd;
+}
+
+void X12OrderImporter::TakeN1(Posting& posting) {
+  posting.n1 = Element(4, {ElementForm::kLast});
+  if (!values_.directToStore.empty() && posting.n1 == values_.directToStore) return;
+  posting.locationLookedAt = posting.n1;
+  posting.checks.CheckLocation("ship to", posting.n1);
+}
+
+void X12OrderImporter::Export(OrderPosting& posting) {
+  if (values_.exports) ExportOrder(*this, posting.log, posting.draft.header);
+}
+
+std::string X12OrderImporter::Element(int n, ElementForm form) {
+  return Try([&] { return std::string(segment_.Read(n, form)); });
+}
+
+std::string X12OrderImporter::ElementOrEnd(int n, ElementForm atEnd) {
+  return Element(n, segment_.PosEndSplat(n) != 0 ? ElementForm{} : atEnd);
+}
+
+double X12OrderImporter::NumberOf(std::string_view text) {
+  return Try([&] { return NumberAtStart(text); });
+}
+
+}  // namespace partnerkit::orders
