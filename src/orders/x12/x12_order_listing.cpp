@@ -51,7 +51,7 @@ void X12OrderImporter::Archive(const std::string& path) {
 }
 
 X12Walk X12OrderImporter::Walk() const {
-  return {values_, Str(Document().PartnerEDIAddr), Str(Document().CompanyEDIAddr)};
+  return {values_, Document().PartnerEDIAddr, Document().CompanyEDIAddr};
 }
 
 // False when a group could not be acknowledged.
