@@ -18,11 +18,12 @@ bool IsLineEnd(char c) { return c == '\r' || c == '\n'; }
 SegmentReader::SegmentReader(InputFile& file, const SegmentSyntax& syntax, std::size_t block)
     : file_(file), syntax_(syntax), buffer_(block) {
   for (const char end : {'\r', '\n', syntax.terminator, syntax.otherEnd}) {
-    if (end != '\0') ends_[static_cast<unsigned char>(end)] = true;
+    if (end != '\0') ends_.push_back({end});
   }
 }
 
 void SegmentReader::Seek(std::uint64_t position) {
+  ForgetEnds();
   const std::uint64_t offset = position - 1;
   if (offset >= base_ && offset <= base_ + filled_) {
     begin_ = static_cast<std::size_t>(offset - base_);
@@ -59,11 +60,23 @@ bool SegmentReader::SkipLineEnds() {
   return false;
 }
 
-// The next byte that ends a segment, or `filled_`.
-std::size_t SegmentReader::FindEnd(std::size_t from) const {
-  const char* const bytes = buffer_.data();
-  while (from < filled_ && !ends_[static_cast<unsigned char>(bytes[from])]) ++from;
-  return from;
+// The next byte that ends a segment, or `filled_`. What was found is remembered: in a file of one line, the line ends
+// would otherwise be searched for to the end of the buffer for every segment.
+std::size_t SegmentReader::FindEnd(std::size_t from) {
+  std::size_t first = filled_;
+  for (End& end : ends_) {
+    if (!end.known || end.next < from) {
+      const void* const at = from < filled_ ? std::memchr(buffer_.data() + from, end.byte, filled_ - from) : nullptr;
+      end.next = at ? static_cast<std::size_t>(static_cast<const char*>(at) - buffer_.data()) : filled_;
+      end.known = true;
+    }
+    first = std::min(first, end.next);
+  }
+  return first;
+}
+
+void SegmentReader::ForgetEnds() {
+  for (End& end : ends_) end.known = false;
 }
 
 // Brings more of the file into the buffer, which grows when one segment fills it. False at the end of the file. What
@@ -77,6 +90,7 @@ bool SegmentReader::Fill() {
   } else if (filled_ == buffer_.size()) {
     buffer_.resize(buffer_.size() * 2);
   }
+  ForgetEnds();
   const std::size_t read = file_.ReadAt(base_ + filled_, std::span(buffer_).subspan(filled_));
   filled_ += read;
   return read > 0;

@@ -13,6 +13,7 @@ constexpr X12OrderValues kValues{
     .keepsBareSegments = false,
     .archives = false,
     .addressesOf13 = true,
+    .n1Form = {ElementForm::kSpan, 17},
     .productForm = {ElementForm::kSpan, 30},
     .countsLines = true,
     .sku = {.qualifiers = "SK", .atEnd = {ElementForm::kSpan, 30}},

@@ -24,6 +24,7 @@ constexpr X12OrderValues kValues{
     .className = "clsTarget850ansix12",
     .storedOrder = kStoredOrder,
     .newOrder = kNewOrder,
+    .showsWholeN1 = true,
     .directToStore = "DTS",
     .countsLines = true,
     .sku = {.qualifiers = "CB SK", .atEnd = {ElementForm::kLast}},

@@ -50,9 +50,7 @@ void X12OrderImporter::Archive(const std::string& path) {
   Try([&] { FileSystem().Copy(path, folder + "/" + path.substr(path.find_last_of("/\\") + 1)); });
 }
 
-X12Walk X12OrderImporter::Walk() const {
-  return {values_, Document().PartnerEDIAddr, Document().CompanyEDIAddr};
-}
+X12Walk X12OrderImporter::Walk() const { return {values_, Document().PartnerEDIAddr, Document().CompanyEDIAddr}; }
 
 // False when a group could not be acknowledged.
 bool X12OrderImporter::WalkFile() {

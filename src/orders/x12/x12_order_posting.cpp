@@ -130,10 +130,13 @@ X12OrderImporter::Next X12OrderImporter::ChangeStored(OrderPosting& posting, Ord
 }
 
 void X12OrderImporter::TakeN1(Posting& posting) {
-  posting.n1 = Element(4, {ElementForm::kLast});
+  constexpr int kLocation = 4;
+  posting.n1 = Element(kLocation, values_.n1Form);
   if (!values_.directToStore.empty() && posting.n1 == values_.directToStore) return;
   posting.locationLookedAt = posting.n1;
-  posting.checks.CheckLocation("ship to", posting.n1);
+  if (posting.checks.FindLocation(posting.n1) != nullptr) return;
+  const std::string shown = values_.showsWholeN1 ? posting.n1 : Element(kLocation, {ElementForm::kSpan, 17});
+  posting.checks.Reject("ship to location " + shown + " does not exist.");
 }
 
 void X12OrderImporter::Export(OrderPosting& posting) {

@@ -81,6 +81,8 @@ struct X12OrderValues {
   std::span<const OrderRule> newOrder = {};
   std::span<const DateOfOrder> dates = kUsualDates;
   bool datesDefaultToToday = false;
+  ElementForm n1Form = {ElementForm::kLast};
+  bool showsWholeN1 = false;              // a missing location is told with all of its number, not with a part
   std::string_view directToStore = {};    // an N1 of this name stands for each store
   std::string_view storeWord = "buying";  // what the messages call the location of an SDQ
   bool rechecksStores = false;            // an SDQ's location is looked up also when it was the last one looked up
