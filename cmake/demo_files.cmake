@@ -1,5 +1,5 @@
 # Puts the samples into the program, so that the demo needs no file beside it: of samples/mgb850 the main story's files, of each
-# other folder a map, an order file and records named for the folder.
+# other folder an order file, records and, for CSV, a map, named for the folder.
 function(partnerkit_demo_file path file)
   set_property(DIRECTORY ${PROJECT_SOURCE_DIR} APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${file})
   file(READ ${file} text)
@@ -16,8 +16,12 @@ list(REMOVE_ITEM folders ${samples}/mgb850)
 foreach(folder IN LISTS folders)
   cmake_path(GET folder FILENAME name)
   partnerkit_demo_file(records/${name}.json ${folder}/records.json)
-  partnerkit_demo_file(maps/${name}.map ${folder}/${name}.map)
-  partnerkit_demo_file(inbox/${name}.csv ${folder}/orders.csv)
+  if(EXISTS ${folder}/orders.x12)
+    partnerkit_demo_file(inbox/${name}.x12 ${folder}/orders.x12)
+  else()
+    partnerkit_demo_file(maps/${name}.map ${folder}/${name}.map)
+    partnerkit_demo_file(inbox/${name}.csv ${folder}/orders.csv)
+  endif()
 endforeach()
 configure_file(${CMAKE_CURRENT_LIST_DIR}/demo_files.cpp.in ${PROJECT_BINARY_DIR}/demo_files.cpp @ONLY)
 target_sources(partnerkit_cli PRIVATE ${PROJECT_BINARY_DIR}/demo_files.cpp)

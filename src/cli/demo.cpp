@@ -25,6 +25,7 @@ namespace {
 
 constexpr std::string_view kOrders = "inbox/orders.csv";
 constexpr std::string_view kBackup = "backup/po.csv";
+constexpr std::string_view kAcknowledged = "FA_PO_771_";  // its file's name behind that is the time
 
 // The columns of the order file worth looking at, from 0: transaction, order, store, product, cost, quantity.
 constexpr std::size_t kShownColumns[] = {2, 7, 16, 20, 23, 24};
@@ -39,8 +40,8 @@ void CopyFiles() {
   }
 }
 
-std::vector<std::string> LinesOf(std::string_view path) {
-  std::ifstream in{fs::path(path)};
+std::vector<std::string> LinesOf(const fs::path& path) {
+  std::ifstream in(path);
   std::vector<std::string> lines;
   for (std::string line; std::getline(in, line);) lines.push_back(line);
   return lines;
@@ -140,6 +141,10 @@ std::vector<Step> OtherPartners() {
       {"Kmart, for one, releases parts of a blanket order; each release is an order of its own:",
        {"process", "6", "inbox/kmart850.csv"},
        kDone},
+      {"Orders also come as X12 interchanges. Kmart's holds three orders and, in a group of their own, a change and a "
+       "cancellation of orders just posted:",
+       {"process", "14", "inbox/kmart850x12.x12"},
+       kTurnedAway},
   };
 }
 
@@ -205,6 +210,16 @@ void TellFiles(const Command& command) {
   for (const std::string& line : left) command.out << ShownFields(line) << '\n';
 }
 
+void TellAcknowledgement(const Command& command) {
+  Tell(command,
+       "The acknowledgement of each group waits in outbox/ for Kmart, written when the file was listed. The first:");
+  command.out << "\n$ cat outbox/" << kAcknowledged << "*.TXT\n";
+  for (const auto& entry : fs::directory_iterator("outbox")) {
+    if (!entry.path().filename().string().starts_with(kAcknowledged)) continue;
+    for (const std::string& line : LinesOf(entry.path())) command.out << line.substr(0, line.find('\r')) << '\n';
+  }
+}
+
 void Talk(const Command& command, Steps& steps, const fs::path& workspace, const std::string& folder) {
   PrintWrapped(command.out,
                "Made the workspace " + workspace.string() +
@@ -217,7 +232,10 @@ void Talk(const Command& command, Steps& steps, const fs::path& workspace, const
   PrintOrders(command);
   TellFiles(command);
   for (const Step& step : OtherPartners()) TellStep(command, steps, step);
-  Tell(command, "To go on: correct the price in records.json, load it again and run the same `process` command.");
+  TellAcknowledgement(command);
+  Tell(command,
+       "To go on with the order of MGB that failed: correct the price in records.json, load it again and run the same "
+       "`process` command.");
 }
 
 void TalkJson(const Command& command, Steps& steps, const fs::path& workspace) {

@@ -120,7 +120,7 @@ class Verbs {
   }
 
   void AddRunVerbs() {
-    AddRunVerb("rows", "Show the rows of a file and leave it as it is", "rows 1 inbox/orders.csv",
+    AddRunVerb("rows", "Show the rows of a file and carry none out", "rows 1 inbox/orders.csv",
                [this](const Command& command) { return ShowRows(command, document_, file_); });
     AddRunVerb("process", "Carry out rows of a file and settle it", "process 1 inbox/orders.csv --row 0 --row 2",
                [this](const Command& command) { return ProcessRows(command, document_, file_, rows_); })

@@ -133,16 +133,21 @@ class Run {
     const std::int32_t id = translator_->Process(row, result.errorLog);
     result.result = id;
     const bool orderGone = host_.OrdersDeleted() > deletedBefore;
-    result.outcome = id != 0                                          ? Outcome::kPosted
-                     : orderGone && SaysOnlyWarnings(result.errorLog) ? Outcome::kCancelled
-                                                                      : Outcome::kTurnedAway;
+    result.outcome = OutcomeOf(id, orderGone, SaysOnlyWarnings(result.errorLog));
     if (result.outcome == Outcome::kTurnedAway) status_ = kTurnedAway;
     report_.results.push_back(std::move(result));
   }
 
-  // A cancellation that was carried out leaves warnings only, and no id of an order.
+  // A posting leaves information. Warnings alone tell of a stored order that was cancelled or changed in place, and its
+  // id may be the result.
+  static Outcome OutcomeOf(std::int32_t id, bool orderGone, bool onlyWarnings) {
+    if (onlyWarnings && orderGone) return Outcome::kCancelled;
+    if (id == 0) return Outcome::kTurnedAway;
+    return onlyWarnings ? Outcome::kChanged : Outcome::kPosted;
+  }
+
   bool SaysOnlyWarnings(const ErrorList& errorLog) {
-    return errorLog && std::ranges::all_of(*errorLog, [&](std::int32_t id) {
+    return errorLog && !errorLog->empty() && std::ranges::all_of(*errorLog, [&](std::int32_t id) {
              Log log;
              log.LogId = id;
              return workspace_.Host().Records().Load(Log::kType, &log) && log.ErrorNumber == kWarning;

@@ -104,6 +104,8 @@ std::string Told(const RowResult* result) {
   switch (result->outcome) {
     case Outcome::kPosted:
       return "posted, id " + std::to_string(std::get<std::int32_t>(result->result));
+    case Outcome::kChanged:
+      return "changed, id " + std::to_string(std::get<std::int32_t>(result->result));
     case Outcome::kCancelled:
       return "cancelled";
     case Outcome::kDeleted:
@@ -136,7 +138,8 @@ void PrintGrid(const Command& command, const RunReport& report, RecordStore& sto
 
 void PrintSummary(const Command& command, const RunReport& report) {
   command.out << '\n' << Counted(report.rows.Rows(), "row", "rows");
-  constexpr std::array<std::pair<Outcome, std::string_view>, 4> kOutcomes = {{{Outcome::kPosted, "posted"},
+  constexpr std::array<std::pair<Outcome, std::string_view>, 5> kOutcomes = {{{Outcome::kPosted, "posted"},
+                                                                              {Outcome::kChanged, "changed"},
                                                                               {Outcome::kCancelled, "cancelled"},
                                                                               {Outcome::kDeleted, "deleted"},
                                                                               {Outcome::kTurnedAway, "not done"}}};

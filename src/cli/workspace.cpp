@@ -13,8 +13,9 @@ namespace fs = std::filesystem;
 
 namespace {
 
-// maps: column-name maps. inbox: what partners sent. backup: lines of posted orders. spool: print jobs.
-constexpr std::string_view kFolders[] = {"maps", "inbox", "backup", "spool"};
+// maps: column-name maps. inbox: what partners sent. outbox: what goes to them. backup: lines of posted orders.
+// spool: print jobs.
+constexpr std::string_view kFolders[] = {"maps", "inbox", "outbox", "backup", "spool"};
 
 fs::path ChosenFolder(const Options& options) {
   if (!options.workspace.empty()) return AbsolutePath(options.workspace);

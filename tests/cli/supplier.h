@@ -10,9 +10,9 @@
 
 namespace partnerkit::testing {
 
-inline std::string Sample(const std::string& name) {
+inline std::string Sample(const std::string& name, const std::string& of = "mgb850") {
   std::ostringstream bytes;
-  bytes << std::ifstream(PARTNERKIT_SOURCE_DIR "/samples/mgb850/" + name, std::ios::binary).rdbuf();
+  bytes << std::ifstream(PARTNERKIT_SOURCE_DIR "/samples/" + of + "/" + name, std::ios::binary).rdbuf();
   return bytes.str();
 }
 

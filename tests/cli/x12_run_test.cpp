@@ -1,0 +1,95 @@
+#include <gmock/gmock.h>
+
+#include "cli/supplier.h"
+
+namespace partnerkit::testing {
+namespace {
+
+using nlohmann::json;
+using ::testing::EndsWith;
+using ::testing::HasSubstr;
+using ::testing::StartsWith;
+
+// The sample supplier, and Kmart's X12 orders in its inbox: three orders, a change and a cancellation.
+class RunX12 : public Supplier {
+ protected:
+  void SetUp() override {
+    Supplier::SetUp();
+    folder.Write("kmart.json", Sample("records.json", "kmart850x12"));
+    folder.Write("inbox/kmart.x12", Sample("orders.x12", "kmart850x12"));
+    EXPECT_EQ(Run({"data", "load", "kmart.json"}).status, 0);
+  }
+
+  json Orders() { return Json({"data", "dump", "Order"})["Order"]; }
+};
+
+TEST_F(RunX12, ProcessesAnInterchangeAndAcknowledgesItsGroups) {
+  const json done = Json({"--now", "2006-03-08T10:15:00", "process", "14", "inbox/kmart.x12"}, 1);
+  EXPECT_EQ(done["rows"], json::parse(R"([["K441301", "2006-03-06", "000000770/771/0001", ""],
+                                          ["K441302 REL# 2", "2006-03-06", "000000770/771/0002", ""],
+                                          ["K441303", "2006-03-07", "000000770/771/0003", ""],
+                                          ["K441301", "2006-03-07", "000000770/772/0001", ""],
+                                          ["K441302 REL# 2", "2006-03-07", "000000770/772/0002", ""]])"));
+  EXPECT_EQ(done["results"], json::parse(R"([{"row": 0, "result": 1, "errorLog": [1]},
+                                             {"row": 1, "result": 2, "errorLog": [2]},
+                                             {"row": 2, "result": 0, "errorLog": [3, 4]},
+                                             {"row": 3, "result": 3, "errorLog": [5, 6]},
+                                             {"row": 4, "result": 2, "errorLog": [7]}])"));
+  EXPECT_EQ(done["log"].size(), 7U);
+  EXPECT_EQ(done["log"][6], json::parse(R"({"LogId": 7, "Source": "PartnerKit.clsKMart850ansix12",
+      "Procedure": "Process", "ErrorNumber": -2147221503, "NativeError": 0,
+      "Message": "... Warning Purchase Order Cancel Request K441302 REL# 2."})"));
+  EXPECT_EQ(Orders().size(), 1U);
+  EXPECT_EQ(
+      folder.Read("outbox/FA_PO_771_0603081015.TXT"),
+      "ISA*00*          *00*          *ZZ*9312345000012  *ZZ*9312345900015  *060308*1015*U*00204*000000001*0*P*>\r\n"
+      "GS*FA*931234500001*931234590001*060308*1015*1*X*003020\r\n"
+      "ST*997*0001\r\n"
+      "AK1*PO*771\r\n"
+      "AK9*A*3*3*3\r\n"
+      "SE*4*0001\r\n"
+      "GE*1*1\r\n"
+      "IEA*1*000000001\r\n");
+  EXPECT_THAT(folder.Read("outbox/FA_PO_772_0603081015.TXT"), HasSubstr("AK1*PO*772\r\nAK9*A*2*2*2\r\n"));
+  EXPECT_EQ(folder.Read("archive/kmart.x12"), Sample("orders.x12", "kmart850x12"));
+  const std::string kept = folder.Read("inbox/kmart.x12");
+  EXPECT_THAT(kept, HasSubstr("*771*X*003020*FA DONE*~\r\n"));
+  EXPECT_THAT(kept, HasSubstr("BEG*00*SA*K441303**060307~\r\n"));
+  EXPECT_EQ(kept.find("K441301"), std::string::npos);
+}
+
+// Packing of the first order has begun, so only its dates change, which its flag allows.
+TEST_F(RunX12, TellsAChangeAndACancellationAsSuch) {
+  EXPECT_EQ(Run({"process", "14", "inbox/kmart.x12", "--row", "0", "--row", "1"}).status, 0);
+  Load(R"({"Order": [{"OrderId": 1, "VendorId": "ACME", "PartnerId": "KMART", "PONo": "K441301", "ChangeFlag": "1"}],
+           "Job": [{"OrderId": 1}]})");
+  const Ran ran = Run({"process", "14", "inbox/kmart.x12", "--row", "1", "--row", "2"});
+  EXPECT_EQ(ran.status, 0) << ran.err;
+  EXPECT_THAT(ran.out, HasSubstr("  1  K441301         2006-03-07  000000770/772/0001  changed, id 1\n"));
+  EXPECT_THAT(ran.out, HasSubstr("  2  K441302 REL# 2  2006-03-07  000000770/772/0002  cancelled\n"));
+  EXPECT_THAT(ran.out, EndsWith("\n3 rows, 1 changed, 1 cancelled.\n"));
+  const json orders = Orders();
+  ASSERT_EQ(orders.size(), 1U);
+  EXPECT_EQ(orders[0]["NotBefore"], "2006-03-22");
+  EXPECT_EQ(orders[0]["CancelAfter"], "2006-04-05");
+}
+
+TEST_F(RunX12, AcknowledgesAGroupOnceThoughItIsListedAgain) {
+  const std::string noon = "2006-03-08T12:00:00", later = "2006-03-08T12:05:00";
+  EXPECT_EQ(Run({"--now", noon, "rows", "14", "inbox/kmart.x12"}).status, 0);
+  EXPECT_EQ(Run({"--now", later, "rows", "14", "inbox/kmart.x12"}).status, 0);
+  EXPECT_TRUE(folder.Has("outbox/FA_PO_771_0603081200.TXT"));
+  EXPECT_FALSE(folder.Has("outbox/FA_PO_771_0603081205.TXT"));
+}
+
+TEST_F(RunX12, ListsNothingThatItCannotAcknowledge) {
+  std::filesystem::remove(folder / "outbox");
+  const Ran ran = Run({"--json", "process", "14", "inbox/kmart.x12"});
+  EXPECT_EQ(ran.status, 1);
+  EXPECT_THAT(ran.err, StartsWith("partnerkit: inbox/kmart.x12: nothing to list: Cannot open FA file /"));
+  EXPECT_EQ(json::parse(ran.out)["log"][0]["Procedure"], "Open FA File");
+  EXPECT_EQ(folder.Read("inbox/kmart.x12"), Sample("orders.x12", "kmart850x12"));
+}
+
+}  // namespace
+}  // namespace partnerkit::testing
