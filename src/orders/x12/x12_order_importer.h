@@ -70,7 +70,7 @@ class X12OrderImporter : public OrderImporter {
   bool SetOrderList(const std::string& path);
   void Archive(const std::string& path);
   bool WalkFile();
-  ListedOrder BeginEntry() const;
+  ListedOrder BeginEntry();
   void CompleteEntry(ListedOrder& entry);
   bool ProcessFA(std::string_view gs, int transactions);
   // Takes the file's next segment in hand. False at its end. Raises RunTimeError.

@@ -77,11 +77,11 @@ bool X12OrderImporter::WalkFile() {
   return !walk.InOrders() || ProcessFA(gs, transactions);
 }
 
-ListedOrder X12OrderImporter::BeginEntry() const {
+ListedOrder X12OrderImporter::BeginEntry() {
   ListedOrder entry;
   entry.InterchangeCtl = interchangeCtl_;
   entry.GroupCtl = groupCtl_;
-  entry.TransactionCtl = segment_.Rest(8);
+  entry.TransactionCtl = Try([&] { return std::string(segment_.Rest(8)); });
   entry.FilePos = static_cast<std::int64_t>(segment_.End());
   return entry;
 }

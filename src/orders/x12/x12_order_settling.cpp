@@ -36,8 +36,8 @@ class X12OrderImporter::Sweep {
   // Keeps what isn't done.
   void Settle() {
     Run([this](const X12Segment& segment, X12Walk::Event event) {
-      if (segment.Begins("ST*")) Judge(segment, event);
-      CleanUp(segment);
+      if (OpensTransaction(segment, event)) Judge(segment, event);
+      CleanUp(segment, event);
     });
   }
 
@@ -45,7 +45,7 @@ class X12OrderImporter::Sweep {
   void TakeOut(std::uint64_t position) {
     bool doomed = false;
     Run([&](const X12Segment& segment, X12Walk::Event event) {
-      if (walk_.At() != X12Walk::Place::kOrders || segment.Begins("ST*")) doomed = false;
+      if (walk_.At() != X12Walk::Place::kOrders || OpensTransaction(segment, event)) doomed = false;
       if (!doomed || IsEnvelopeSegment(segment.Text())) Write(segment);
       if (event == X12Walk::Event::kTransactionBegins && segment.End() == position) doomed = true;
     });
@@ -59,6 +59,11 @@ class X12OrderImporter::Sweep {
     std::string text;
     bool pending = false;
   };
+
+  // Listing is content with less of a tag than its separator.
+  static bool OpensTransaction(const X12Segment& segment, X12Walk::Event event) {
+    return event == X12Walk::Event::kTransactionBegins || segment.Begins("ST*");
+  }
 
   template <class F>
   void Run(F take) {
@@ -122,18 +127,18 @@ class X12OrderImporter::Sweep {
     if (keep_) anyLeft_ = true;
   }
 
-  void CleanUp(const X12Segment& segment) {
+  void CleanUp(const X12Segment& segment, X12Walk::Event event) {
     const std::string_view text = segment.Text();
     if (segment.Begins("ISA")) {
       Hold(interchange_, text);
-    } else if (segment.Begins("GS*")) {
+    } else if (event == X12Walk::Event::kGroupBegins || segment.Begins("GS*")) {
       Hold(group_, Marked(text));
-    } else if (segment.Begins("ST*")) {
+    } else if (OpensTransaction(segment, event)) {
       Hold(transaction_, text);
     } else if (segment.Begins("SE*")) {
       inTransaction_ = false;
       WriteClosing(transaction_, segment);
-    } else if (segment.Begins("GE*")) {
+    } else if (event == X12Walk::Event::kGroupEnds || segment.Begins("GE*")) {
       inTransaction_ = false;
       WriteClosing(group_, segment);
     } else if (segment.Begins("IEA")) {

@@ -36,13 +36,16 @@ void X12Segment::TakeLine(const Segment& segment) {
 
 // Most segments are passed over, so the index waits to be asked for.
 const Elements& X12Segment::Index() const {
-  if (overlong_) {
-    throw RunTimeError(run_time::kOverflow, "The segment " + std::string(text_.substr(0, kShown)) + "... at byte " +
-                                                std::to_string(begin_) + " is too long to be read");
-  }
+  NeedWhole();
   if (!indexed_) elements_.Take(text_);
   indexed_ = true;
   return elements_;
+}
+
+void X12Segment::NeedWhole() const {
+  if (!overlong_) return;
+  throw RunTimeError(run_time::kOverflow, "The segment " + std::string(text_.substr(0, kShown)) + "... at byte " +
+                                              std::to_string(begin_) + " is too long to be read");
 }
 
 std::string_view X12Segment::From(int n) const {
@@ -78,6 +81,7 @@ std::string_view X12Segment::Fixed(std::size_t position, std::size_t length) con
 std::optional<DateTime> X12Segment::FixedDate(std::size_t position) const { return SixDigitDate(Fixed(position, 6)); }
 
 std::string_view X12Segment::Rest(std::size_t position) const {
+  NeedWhole();
   return TrimBlanks(UpToTerminator(Fixed(position, std::string_view::npos)));
 }
 

@@ -54,11 +54,12 @@ class X12Segment {
   // The characters at a position, counted from 1, whatever the separators say; fewer beyond the end.
   std::string_view Fixed(std::size_t position, std::size_t length) const;
   std::optional<DateTime> FixedDate(std::size_t position) const;
-  // From that position to the terminator, blanks cut.
+  // From that position to the terminator, blanks cut. Raises error 6 for an overlong segment.
   std::string_view Rest(std::size_t position) const;
 
  private:
   const Elements& Index() const;
+  void NeedWhole() const;
   // The text from element n on.
   std::string_view From(int n) const;
 
