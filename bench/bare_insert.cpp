@@ -114,6 +114,8 @@ class Table {
       names += (column == 1 ? "\"" : ",\"") + column_name + '"';
       marks += column == 1 ? "?" : ",?";
       if (column_name == "OrderId") owner_ = static_cast<std::size_t>(column);
+      if (column_name == "VendorId") vendor_ = static_cast<std::size_t>(column);
+      if (column_name == "PartnerId") partner_ = static_cast<std::size_t>(column);
       if (column_name == "PONo") number_ = static_cast<std::size_t>(column);
       if (column_name == "Status") status_ = static_cast<std::size_t>(column);
     }
@@ -126,7 +128,8 @@ class Table {
 
   const std::string& InsertSql() const { return insert_; }
   std::vector<Row>& Rows() { return rows_; }
-  const std::string& Number(const Row& row) const { return row[number_].text; }
+  // What an order is found by.
+  std::array<Value, 3> Number(const Row& row) const { return {row[vendor_], row[partner_], row[number_]}; }
   Value& Status(Row& row) const { return row[status_]; }
 
   // Inserts the next row. Its id has to come out as in the source, for later rows name it.
@@ -143,7 +146,7 @@ class Table {
 
  private:
   std::string name_, insert_;
-  std::size_t owner_ = 0, number_ = 0, status_ = 0;
+  std::size_t owner_ = 0, vendor_ = 0, partner_ = 0, number_ = 0, status_ = 0;
   std::vector<Row> rows_;
   std::size_t next_ = 0;
 };
@@ -166,7 +169,7 @@ struct Import {
   void Store(const Database& target) {
     Query begin(target, "BEGIN IMMEDIATE");
     Query commit(target, "COMMIT");
-    Query find(target, "SELECT OrderId FROM tbOrder WHERE VendorId='ACME' AND PartnerId='MGB' AND PONo=?");
+    Query find(target, "SELECT OrderId FROM tbOrder WHERE VendorId=? AND PartnerId=? AND PONo=?");
     Query finish(target, "UPDATE tbOrder SET Status=0 WHERE OrderId=?");
     Query insertOrder(target, order.InsertSql());
     Query insertLog(target, log.InsertSql());
@@ -174,8 +177,8 @@ struct Import {
                                        Query(target, parts[2].InsertSql())};
     for (const Row& row : order.Rows()) {
       begin.Execute();
-      const std::string& number = order.Number(row);
-      sqlite3_bind_text(find.Handle(), 1, number.data(), static_cast<int>(number.size()), SQLITE_STATIC);
+      const auto number = order.Number(row);
+      for (int place = 0; place < 3; ++place) Bind(find.Handle(), place + 1, number[static_cast<std::size_t>(place)]);
       if (find.Step()) throw std::runtime_error("the target holds the orders already");
       sqlite3_reset(find.Handle());
       order.InsertNext(target, insertOrder);

@@ -1,5 +1,6 @@
 #!/usr/bin/env python3
-"""Times the program against bare yardsticks on this machine and prints their ratios.
+"""Times the program against bare yardsticks on this machine and prints their ratios, for the model class and the slowest
+of the others.
 
 Each ratio is taken in one go: the two sides run in turn, the median of each counts. Other work on the machine distorts the
 figures; --cpu compares processor time instead of elapsed time, which suffers less but leaves out the waiting for the disk.
@@ -18,6 +19,7 @@ import tempfile
 import time
 
 import generate_orders
+import order_samples
 
 PROGRAM = pathlib.Path(os.environ["PARTNERKIT_PROGRAM"]).resolve()
 BUILD = pathlib.Path(os.environ["PARTNERKIT_BUILD"]).resolve()
@@ -28,7 +30,10 @@ BENCH = BUILD / "bench"
 LARGE_FILE_COPIES = 5
 BYTES_PER_ORDER = 60_000
 
-FULL = {"runs": 5, "bytes": 150_000_000, "orders": 2_000, "many": 20_000}
+MODEL, SLOWEST = "clsMGB850csv", "clsColesEIDCPOcsv"
+
+FULL = {"runs": 3, "bytes": 150_000_000, "orders": 2_000, "many": 20_000}
+SURVEY = {"runs": 3, "bytes": 15_000_000, "orders": 500, "many": 1_500}
 QUICK = {"runs": 1, "bytes": 3_000_000, "orders": 60, "many": 200}
 
 
@@ -52,8 +57,9 @@ def run(*command):
 
 
 class Bench:
-    def __init__(self, folder, sizes, cpu):
+    def __init__(self, folder, of_class, sizes, cpu):
         self.folder = folder
+        self.of_class = of_class
         self.sizes = sizes
         self.cpu = cpu
         self.over = False
@@ -62,7 +68,7 @@ class Bench:
         self.supplier = generate_orders.Supplier(1)
 
     def prepare(self):
-        generate_orders.write_masters(self.folder, self.supplier)
+        generate_orders.write_masters(self.folder, self.of_class, self.supplier)
         run(PROGRAM, "new", self.workspace)
         shutil.copy(self.folder / "orders.map", self.workspace / "maps")
         run(PROGRAM, "--workspace", self.workspace, "data", "load", self.folder / "records.json")
@@ -73,7 +79,7 @@ class Bench:
 
     def orders(self, name, **length):
         path = self.folder / name
-        generate_orders.write_orders(path, self.supplier, **length)
+        generate_orders.write_orders(path, self.of_class, self.supplier, **length)
         return path
 
     def fresh(self, file):
@@ -124,7 +130,7 @@ class Bench:
 
     def settle(self, which):
         inbox = self.fresh(self.large)
-        out, _, _, _ = run(BENCH / "settle", which, self.workspace, inbox)
+        out, _, _, _ = run(BENCH / "settle", which, self.of_class.prog_id, self.workspace, inbox)
         left = inbox.stat().st_size
         if (left == 0) != (which == "all"):
             raise Failure(f"settling left {left} bytes")
@@ -151,7 +157,7 @@ class Bench:
     def measure(self):
         megabytes = self.sizes["bytes"] // 1_000_000
         few, many = self.sizes["orders"], self.sizes["many"]
-        self.print_line("", "ours", "bare", None)
+        self.print_line(self.of_class.name, "ours", "bare", None)
         self.compare(f"rows of {megabytes} MB : tokeniser", self.rows, self.tokenise, 1.6)
         self.print_line("  its memory : 60 MB", f"{self.memory / 1e6:.1f} MB", "60.0 MB", 1.0, self.memory / 60e6)
         self.compare(f"process of {few} orders : bare inserts", self.process_few, self.bare_insert, 2.0)
@@ -171,10 +177,13 @@ def main():
     parser = argparse.ArgumentParser(prog="./pk bench", description=__doc__,
                                      formatter_class=argparse.RawDescriptionHelpFormatter)
     parser.add_argument("--quick", action="store_true", help="small sizes, once each: shows that it runs, not how fast")
+    parser.add_argument("--class", dest="named", help="one class instead, or all, these at a smaller size")
     parser.add_argument("--cpu", action="store_true", help="compare processor time")
-    parser.add_argument("--runs", type=int, help="how often each side runs (5)")
+    parser.add_argument("--runs", type=int, help="how often each side runs (%d)" % FULL["runs"])
     options = parser.parse_args()
-    sizes = dict(QUICK if options.quick else FULL)
+    sizes = dict(QUICK if options.quick else SURVEY if options.named == "all" else FULL)
+    classes = order_samples.order_classes() if options.named == "all" else \
+        [order_samples.order_class(name) for name in ([options.named] if options.named else [MODEL, SLOWEST])]
     if options.runs:
         sizes["runs"] = options.runs
     signal.signal(signal.SIGTERM, lambda *_: sys.exit(2))  # so that the files go
@@ -182,17 +191,20 @@ def main():
     if load > cores / 4:
         print(f"bench: {load:.1f} processes keep the {cores} processors of this machine busy; the figures suffer",
               file=sys.stderr)
+    over = False
     try:
         check_space(sizes)
-        with tempfile.TemporaryDirectory(prefix="bench-", dir=BUILD) as folder:
-            bench = Bench(pathlib.Path(folder), sizes, options.cpu)
-            bench.prepare()
-            bench.measure()
+        for of_class in classes:
+            with tempfile.TemporaryDirectory(prefix="bench-", dir=BUILD) as folder:
+                bench = Bench(pathlib.Path(folder), of_class, sizes, options.cpu)
+                bench.prepare()
+                bench.measure()
+            over |= bench.over
     except (Failure, OSError) as failure:
         print(f"bench: {failure}", file=sys.stderr)
         return 2
     # Small sizes measure the start of the programs, so nothing is over then.
-    return 1 if bench.over and not options.quick else 0
+    return 1 if over and not options.quick else 0
 
 
 if __name__ == "__main__":

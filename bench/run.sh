@@ -5,4 +5,4 @@ set -eu
 cd "$(dirname "$0")"
 : "${PARTNERKIT_PROGRAM:?is the path of the program}"
 : "${PARTNERKIT_BUILD:?is the build folder}"
-PYTHONDONTWRITEBYTECODE=1 exec python3 measure.py "$@"
+PYTHONDONTWRITEBYTECODE=1 PYTHONPATH=../tools exec python3 measure.py "$@"

@@ -1,6 +1,6 @@
 // How long `Term` takes to settle an order file, apart from the posting: the store of this program takes every order
 // and keeps none.
-//   settle all|one WORKSPACE FILE
+//   settle all|one CLASS WORKSPACE FILE
 // all: every order is posted, so that all lines go to the backup and the file ends empty.
 // one: the first order is posted, so that all lines but its own are kept.
 #include <cstdio>
@@ -40,19 +40,26 @@ class ForgetfulHost : public System, private RecordStore {
   }
   bool Update(const RecordType&, const void*) override { return true; }
   bool Delete(const RecordType&, const void*) override { return false; }
-  bool Find(const RecordType&, const Lookup&, void*) override { return false; }
-  void Select(const RecordType&, const Lookup&, const void*, const std::function<void*()>&) override {}
-  std::int32_t Count(const RecordType&, const Lookup&, const void*) override { return 0; }
+  bool Find(const RecordType& type, const Lookup& lookup, void* record) override {
+    return &type != &Order::kType && host_.Records().Find(type, lookup, record);
+  }
+  void Select(const RecordType& type, const Lookup& lookup, const void* probe,
+              const std::function<void*()>& next) override {
+    host_.Records().Select(type, lookup, probe, next);
+  }
+  std::int32_t Count(const RecordType& type, const Lookup& lookup, const void* probe) override {
+    return host_.Records().Count(type, lookup, probe);
+  }
   std::int32_t NativeError() const override { return 0; }
 
   host::SqlHost& host_;
   std::int32_t lastId_ = 0;
 };
 
-int Settle(bool all, const std::string& workspace, const std::string& file) {
+int Settle(bool all, const std::string& progId, const std::string& workspace, const std::string& file) {
   const auto host = host::SqlHost::Open(workspace + "/partnerkit.db");
   ForgetfulHost system(*host);
-  const auto importer = CreateTranslator("PartnerKit.clsMGB850csv", platform::DefaultPorts());
+  const auto importer = CreateTranslator(progId, platform::DefaultPorts());
   ColumnTable columns;
   RowTable rows;
   if (!importer->Init(system, 1, columns)) return 1;
@@ -70,12 +77,12 @@ int Settle(bool all, const std::string& workspace, const std::string& file) {
 }  // namespace
 
 int main(int count, char** arguments) {
-  const std::string_view mode = count == 4 ? arguments[1] : "";
+  const std::string_view mode = count == 5 ? arguments[1] : "";
   if (mode != "all" && mode != "one") {
-    std::fputs("usage: settle all|one WORKSPACE FILE\n", stderr);
+    std::fputs("usage: settle all|one CLASS WORKSPACE FILE\n", stderr);
     return 2;
   }
-  const int status = Settle(mode == "all", arguments[2], arguments[3]);
+  const int status = Settle(mode == "all", arguments[2], arguments[3], arguments[4]);
   if (status != 0) std::fputs("settle: the file could not be listed, posted or settled\n", stderr);
   return status;
 }

@@ -25,6 +25,7 @@ class Case:
     def __init__(self, program, scenario, root):
         self.program = program
         self.scenario = scenario
+        self.trade = scenario.file.trade
         self.root = root
         self.folder = scenario.copy(root)
         self.found = []
@@ -137,17 +138,17 @@ def file_moved_away_over_a_run(case):
     case.carry_on()
 
 
-def other_file(number=4600000000):
-    return orders.make_file(3, 2, 2, plain=True, first_number=number, seed=2)
+def other_file(case):
+    return case.trade.make_file(3, plain=True, first_number=46000000, seed=2)
 
 
 def both(first, second):
-    return orders.OrderFile(first.orders + second.orders)
+    return orders.OrderFile(first.trade, first.orders + second.orders)
 
 
 def file_replaced(case):
     run = case.stopped()
-    new = other_file()
+    new = other_file(case)
     draft = case.folder / "inbox" / "new.csv"
     draft.write_bytes(new.content())
     os.replace(draft, case.folder / ORDER_FILE)
@@ -164,7 +165,7 @@ def file_replaced(case):
 
 def file_grows(case):
     run = case.stopped()
-    new = other_file()
+    new = other_file(case)
     with open(case.folder / ORDER_FILE, "ab") as grown:
         grown.write(b"\r\n" + new.content())
     old = case.scenario.file
@@ -265,13 +266,12 @@ def file_is_a_folder(case):
 # --- Several programs on one store
 
 FILES = 4
-# The first of the files; the others are plain, with numbers of their own.
-FILE_OF_SEVERAL = orders.make_file(100, 4, 2)
 
 
 def several_programs(case, kill_after=None):
-    files = [FILE_OF_SEVERAL] + [orders.make_file(100, 4, 2, first_number=4500000000 + 1000 * index, plain=True)
-                                 for index in range(1, FILES)]
+    # The first shows every kind; the others are plain, with numbers of their own.
+    files = [case.scenario.file] + [case.trade.make_file(100, 4, first_number=45000000 + 1000 * index, plain=True)
+                                    for index in range(1, FILES)]
     for index, file in enumerate(files):
         (case.folder / f"inbox/{index}.csv").write_bytes(file.content())
 
@@ -298,7 +298,7 @@ def several_programs(case, kill_after=None):
         kill_after = None
         for ended in all_at_once():
             case.expect(ended, (0, 1))
-    everything = orders.OrderFile([order for file in files for order in file.orders])
+    everything = orders.OrderFile(case.trade, [order for file in files for order in file.orders])
     case.found += verdict.store_violations(case.folder, orders.expected_store(everything))
     for index, file in enumerate(files):
         if (case.folder / f"inbox/{index}.csv").read_bytes() != file.kept():
@@ -336,7 +336,7 @@ CASES = (
 )
 
 
-def run(program, root, slow, names=()):
+def run(program, trade, root, slow, names=()):
     """Yields each case's name, its workspace and what was found; of all cases, or those of these names."""
     root = root / "failures"
     root.mkdir()
@@ -346,7 +346,8 @@ def run(program, root, slow, names=()):
     for number, (name, act, takes_long, how) in enumerate(CASES):
         if (takes_long and not slow) or (names and name not in names):
             continue
-        file = FILE_OF_SEVERAL if "documents" in how else orders.make_file(3 if takes_long else 25, 2, 2, seed=number)
+        size = {"count": 100, "products": 4} if "documents" in how else {"count": 3 if takes_long else None}
+        file = trade.make_file(**size, seed=number)
         case = Case(program, Scenario(program, root, f"failure{number}", file, **how), root)
         case.folder.chmod(0o755)
         act(case)

@@ -4,56 +4,57 @@ import json
 import random
 from dataclasses import dataclass, field
 
+import kinds
+from kinds import FAULTY, KEPT, POSTED
+from order_samples import WAREHOUSE
+
 PRODUCTS = [f"93123456{number:05}" for number in range(10001, 10009)]
 STORES = ["0052", "0061", "0117", "0130", "0204"]
-WAREHOUSE = "0900"
 COSTS = {product: 10.5 + index for index, product in enumerate(PRODUCTS)}
 RETAILS = {product: 19.95 + index for index, product in enumerate(PRODUCTS)}
-
-MAP = ["INTCONTROLNO", "GRPCONTROLNO", "TRNCONTROLNO", "PARTNEREDIADDR", "COMPANYEDIADDR", "POPURPOSECODE",
-       "POTYPECODE", "PONUMBER", "PODATE", "SUPPLIERNO", "CUSTCAT", "DEPTNO", "NOTBEFORE", "CANCAFTER", "ADDATE",
-       "STOREZONE", "BUYINGLOCPARTNERNO", "SHIPTOLOCPARTNERNO", "SEQUENTIALLINENO", "PRODUCTQUALIFIER",
-       "INCOMINGPRODUCTNO", "UNITMEASURECODE", "UNITPRICECODE", "UNITPRICE", "ORDERQUANTITY", "SKUPRODUCTKEYCODE",
-       "RETAILUNITPRICE", "ALLOCATEQUANTITY", "CUSTOMERREF", "CUSTOMERNO", "STYLE", "COLOUR", "SIZE", "DESCRIPTION",
-       "WEIGHT", "VOLUME", "BIN", "LINEREF"]
-
-# What becomes of an order.
-POSTED = "posted"        # in the store once, its lines in the backup
-KEPT = "kept"            # in the file, byte for byte
-DROPPED = "dropped"      # turned away for good: in neither
-
-# One of each kind among this many orders; every other one is plain.
-CYCLE = 25
-KINDS = {3: ("unknown product", KEPT), 5: ("stored already", DROPPED), 7: ("other cost", KEPT),
-         9: ("unknown store", KEPT), 11: ("line twice", KEPT), 13: ("foreign", KEPT),
-         16: ("cancels nothing", DROPPED), 18: ("replaces", POSTED), 20: ("cancels", DROPPED),
-         22: ("sent twice", POSTED), 24: ("half stored", POSTED)}
+OTHER_COST = 99.0
+BLANK = b"\r\n"
 
 
 @dataclass
 class Order:
     number: str
-    kind: str
-    fate: str
+    kind: kinds.Kind
     controls: tuple
-    lines: list = field(default_factory=list)   # (product, store, quantity, allocated)
+    lines: list = field(default_factory=list)   # (product, store, ship-to, quantity, allocated, cost), as stored
     texts: list = field(default_factory=list)   # the lines as they stand in the file
-    stored: bool = False                        # an older order of this number is in the store
+
+    @property
+    def fate(self):
+        return self.kind.fate
+
+    def is_stored(self):
+        return self.fate in (POSTED, FAULTY)
 
 
-@dataclass
 class OrderFile:
-    orders: list
-    options: str = ""
+    def __init__(self, trade, orders, options=""):
+        self.trade = trade
+        self.orders = orders
+        self.options = options
 
     def content(self):
-        return b"".join(text for order in self.orders for text in order.texts)
+        return b"".join(text for text, _ in self.pieces())
 
-    def kept(self):
-        return b"".join(text for order in self.orders if order.fate == KEPT for text in order.texts)
+    def kept(self, besides=()):
+        """What stays, `besides` orders that have these numbers."""
+        return b"".join(text for text, stays in self.pieces(besides) if stays)
+
+    def pieces(self, besides=()):
+        """Every line, and whether it stays in the file."""
+        for order in self.orders:
+            for number, text in enumerate(order.texts):
+                if number == 1 and order.kind is kinds.BLANK_LINE:
+                    yield BLANK, not self.trade.drops_blank_lines
+                yield text, order.fate == KEPT or order.number in besides
 
     def posted(self):
-        return [order for order in self.orders if order.fate == POSTED]
+        return [order for order in self.orders if order.is_stored()]
 
     def owners(self):
         """The order of each line, as the backup holds it."""
@@ -64,107 +65,120 @@ def whole(text):
     return text if text.endswith(b"\n") else text + b"\r\n"
 
 
-def make_file(count, products, stores, *, plain=False, first_number=4500000000, seed=1, options=""):
-    """`plain`: orders that post only, so that the file ends empty."""
-    rng = random.Random(seed)
-    orders = []
-    for index in range(count):
-        kind, fate = ("plain", POSTED) if plain else KINDS.get(index % CYCLE, ("plain", POSTED))
-        order = Order(str(first_number + index), kind, fate, (f"{first_number % 1000000:09}", "481", f"{index:04}"))
-        order.stored = kind in ("stored already", "replaces", "cancels", "half stored")
-        fill(order, products, stores, rng)
-        orders.append(order)
-    # The partner's last line has no end.
-    orders[-1].texts[-1] = orders[-1].texts[-1].rstrip(b"\r\n")
-    return OrderFile(orders, options)
+class Trade:
+    """One class, and the supplier who gets its orders."""
+
+    def __init__(self, order_class):
+        self.order_class = order_class
+        self.kinds = kinds.KINDS[order_class.name]
+        self.cycle = 2 * len(self.kinds) + 1
+        self.drops_blank_lines = order_class.name == "clsKMart850csv"
+        # So an order that a killed run has posted stays in the file: the next run turns it away as stored already.
+        self.keeps_turned_away = order_class.name in ("clsCMLFLFPOcsv", "clsTargetBulkPOcsv")
+        self.answers_orders = any(kind.fate == FAULTY for kind in self.kinds)
+
+    def make_file(self, count=None, products=2, stores=2, *, plain=False, first_number=45000000, seed=1, options=""):
+        """`count`: as many as show every kind. `plain`: orders that post only, so that the file ends empty."""
+        rng = random.Random(seed)
+        orders = []
+        for index in range(count or self.cycle):
+            place, other = divmod(index % self.cycle, 2)
+            kind = self.kinds[place] if other and not plain else kinds.PLAIN
+            group = "481" if self.order_class.typical["GRPCONTROLNO"] else ""
+            order = Order("", kind, (f"{first_number:09}", group, f"{index:04}"))
+            again = kind.name == "sent anew"
+            self.fill(order, str(first_number + index - again), products, stores, rng)
+            orders.append(order)
+        # The partner's last line has no end.
+        orders[-1].texts[-1] = orders[-1].texts[-1].rstrip(b"\r\n")
+        return OrderFile(self, orders, options)
+
+    def fill(self, order, number, products, stores, rng):
+        for sequence, product in enumerate(PRODUCTS[:products], 1):
+            for store in STORES[:stores]:
+                self.add_line(order, number, sequence, product, store, rng.randint(1, 900), rng.randint(0, 9))
+        if order.kind.name.endswith("line twice"):
+            self.add_line(order, number, products, product, store, 5, 3)
+        if order.kind is kinds.SENT_TWICE:
+            order.texts += [text.replace(b"\r\n", b",again\r\n") for text in order.texts]
+
+    def add_line(self, order, number, sequence, product, store, quantity, allocated):
+        of_class = self.order_class
+        changes = order.kind.changes
+        cost = OTHER_COST if order.kind.name == "other cost" else COSTS[product]
+        retail, sku = RETAILS[product], "SKU" + product[-4:]
+        if order.kind.name == "unknown product":
+            product = product.replace("93", "99", 1)
+        controls = dict(zip(("INTCONTROLNO", "GRPCONTROLNO", "TRNCONTROLNO"), order.controls))
+        fields = of_class.line(product, store, quantity, cost, retail, sku, **{
+            **controls, "PONUMBER": number, "SEQUENTIALLINENO": sequence, "ALLOCATEQUANTITY": allocated,
+            "LINEREF": len(order.lines) + 1, **changes})
+        order.number = kinds.number_of(of_class.name, fields)
+        order.lines.append((product, store, of_class.ship_to(store), float(quantity * of_class.units), float(allocated),
+                            of_class.stored_cost(cost)))
+        order.texts.append(",".join(f'"{text}"' if "," in text else text for text in fields.values()).encode() + BLANK)
+
+    def records(self, file, *, backup="backup/po.csv", documents=1):
+        """The supplier's records, with the older orders that the file meets in the store."""
+        of_class = self.order_class
+        products = [(product, COSTS[product], RETAILS[product], "SKU" + product[-4:]) for product in PRODUCTS]
+        vendors = [f"ACME{number}" for number in range(1, documents + 1)]
+        data = {"System": {"UserId": "torture"}, "Partner": of_class.records["Partner"], "Vendor": [], "EDIDoc": [],
+                **of_class.masters(products, STORES, vendors),
+                "Order": [], "OrderLine": [], "OrderLocn": [], "OrderLocnLine": [], "Job": []}
+        for number, vendor in enumerate(vendors, 1):
+            data["Vendor"].append({"VendorId": vendor, "Name": "Acme Apparel", "POBackupFile": backup})
+            document = {**of_class.document, "EDIDocId": number, "VendorId": vendor, "MapFolder": "maps/",
+                        "MapFile": "orders.map", "Options": file.options}
+            data["EDIDoc"].append(document)
+            if self.answers_orders:
+                data["EDIDoc"].append({**document, "EDIDocId": documents + number, "DocumentCode": "855"})
+        for order in file.orders:
+            if order.kind.older:
+                self.add_older(data, order)
+        return json.dumps(data)
+
+    def add_older(self, data, order):
+        key = len(data["Order"]) + 1
+        older = order.kind.older
+        controls = order.controls if older == kinds.HALF else ("000000007", "7", "0007")
+        half = older in (kinds.HALF, kinds.OTHER_HALF)
+        data["Order"].append({"OrderId": key, "VendorId": "ACME1", "PartnerId": self.order_class.partner,
+                              "PONo": order.number, "InterchangeCtl": controls[0], "GroupCtl": controls[1],
+                              "TransactionCtl": controls[2], "Status": 9 if half else 0,
+                              "TypeCode": "BL" if older == kinds.BLANKET else "SA"})
+        data["OrderLine"].append({"LineId": key, "OrderId": key, "ProductNo": PRODUCTS[-1], "Quantity": 7, "Cost": 1.5})
+        if older == kinds.PACKED:
+            data["Job"].append({"JobId": key, "OrderId": key})
+        if half:
+            return
+        data["OrderLocn"].append({"LocnId": key, "OrderId": key, "VendorId": "ACME1", "BuyingLocn": STORES[-1]})
+        data["OrderLocnLine"].append({"Id": key, "OrderId": key, "LineId": key, "LocnId": key, "Quantity": 7,
+                                      "ProductNo": PRODUCTS[-1], "BuyingLocn": STORES[-1], "AllocateQty": 7})
 
 
-def fill(order, products, stores, rng):
-    for sequence, product in enumerate(PRODUCTS[:products], 1):
-        for store in STORES[:stores]:
-            order.lines.append((product, store, rng.randint(1, 900), rng.randint(0, 9)))
-            order.texts.append(line(order, sequence, len(order.lines)))
-    if order.kind == "line twice":
-        order.texts.append(line(order, products, len(order.lines)).replace(b"\r\n", b"R\r\n"))
-    if order.kind == "sent twice":
-        order.texts += [text.replace(b"\r\n", b"R\r\n") for text in order.texts]
-
-
-def line(order, sequence, reference):
-    product, store, quantity, allocated = order.lines[-1]
-    cost = COSTS[product] + (1 if order.kind == "other cost" else 0)
-    address = "OTHEREDI" if order.kind == "foreign" else "MGBEDI"
-    purpose = {"replaces": "07", "cancels": "01", "cancels nothing": "01"}.get(order.kind, "00")
-    if order.kind == "unknown product":
-        product = "9399999999999"
-    if order.kind == "unknown store":
-        store = "9999"
-    fields = dict.fromkeys(MAP, "")
-    fields.update(zip(MAP, [*order.controls, address, "ACMEEDI", purpose, "SA", order.number, "20060306", "104455",
-                            "REG", "310", "20060320", "20060403", "", "Z1"]))
-    fields.update(BUYINGLOCPARTNERNO=store, SHIPTOLOCPARTNERNO=WAREHOUSE, SEQUENTIALLINENO=str(sequence),
-                  PRODUCTQUALIFIER="EN", INCOMINGPRODUCTNO=product, UNITMEASURECODE="EA", UNITPRICECODE="WE",
-                  UNITPRICE=f"{cost:.2f}", ORDERQUANTITY=str(quantity), SKUPRODUCTKEYCODE="SKU" + product[-4:],
-                  RETAILUNITPRICE=f"{RETAILS.get(product, 1):.2f}", ALLOCATEQUANTITY=str(allocated),
-                  LINEREF=str(reference))
-    return ",".join(fields.values()).encode() + b"\r\n"
-
-
-def records(file, prog_id, *, backup="backup/po.csv", documents=1):
-    """The supplier's records, with the older orders that the file meets in the store."""
-    data = {
-        "System": {"UserId": "torture"},
-        "Partner": [{"PartnerId": "MGB", "Name": "MGB Stores"}],
-        "Vendor": [], "EDIDoc": [], "PartnerLocn": [],
-        "Product": [{"ProductNo": product, "PartnerId": "MGB", "UOM": "EA", "Symbology": "EN"} for product in PRODUCTS],
-        "ProductPrice": [], "Order": [], "OrderLine": [], "OrderLocn": [], "OrderLocnLine": [],
-    }
-    for document in range(1, documents + 1):
-        vendor = f"ACME{document}"
-        data["Vendor"].append({"VendorId": vendor, "Name": "Acme Apparel", "POBackupFile": backup})
-        data["EDIDoc"].append({"EDIDocId": document, "ProgId": prog_id, "DocumentCode": "850", "PartnerId": "MGB",
-                               "VendorId": vendor, "CompanyEDIAddr": "ACMEEDI", "PartnerEDIAddr": "MGBEDI",
-                               "MapFolder": "maps/", "MapFile": "orders.map", "ValidateProduct": True,
-                               "ValidateCost": True, "ValidateRetail": True, "Options": file.options})
-        data["PartnerLocn"] += [{"VendorId": vendor, "PartnerLocnNo": store} for store in [*STORES, WAREHOUSE]]
-        data["ProductPrice"] += [{"VendorId": vendor, "ProductNo": product, "Cost": COSTS[product],
-                                  "Retail": RETAILS[product], "SKU": "SKU" + product[-4:]} for product in PRODUCTS]
-    for order in file.orders:
-        if order.stored:
-            add_older(data, order)
-    return json.dumps(data)
-
-
-def add_older(data, order):
-    """Half stored: this very order, as a program leaves it that dies under a store without transactions."""
-    key = len(data["Order"]) + 1
-    half = order.kind == "half stored"
-    controls = order.controls if half else ("000000007", "7", "0007")
-    data["Order"].append({"OrderId": key, "VendorId": "ACME1", "PartnerId": "MGB", "PONo": order.number,
-                          "InterchangeCtl": controls[0], "GroupCtl": controls[1], "TransactionCtl": controls[2],
-                          "Status": 9 if half else 0})
-    data["OrderLine"].append({"LineId": key, "OrderId": key, "ProductNo": PRODUCTS[-1], "Quantity": 7, "Cost": 1.5})
-    if half:
-        return
-    data["OrderLocn"].append({"LocnId": key, "OrderId": key, "VendorId": "ACME1", "BuyingLocn": STORES[-1]})
-    data["OrderLocnLine"].append({"Id": key, "OrderId": key, "LineId": key, "LocnId": key,
-                                  "ProductNo": PRODUCTS[-1], "BuyingLocn": STORES[-1], "Quantity": 7, "AllocateQty": 7})
+def summed(entries):
+    """Adds up the quantities of entries that are alike in all but these, which stand behind the key."""
+    sums = {}
+    for key, *quantities in entries:
+        sums[key] = [sum(pair) for pair in zip(sums.get(key, [0.0] * len(quantities)), quantities)]
+    return sums
 
 
 def expected_store(file):
-    """The lines, locations and location lines of every order that has to be in the store, by number."""
+    """Status, lines, locations and location lines of every order that has to be in the store, by number."""
     store = {}
     for order in file.orders:
-        if order.fate == POSTED:
-            quantities = {}
-            for product, _, quantity, _ in order.lines:
-                quantities[product] = quantities.get(product, 0) + quantity
+        if order.is_stored():
+            lines = summed(((product, cost), quantity) for product, _, _, quantity, _, cost in order.lines)
+            parts = summed(((place, product), quantity, allocated)
+                           for product, place, _, quantity, allocated, _ in order.lines)
             store[order.number] = (
-                sorted((product, float(quantity), COSTS[product]) for product, quantity in quantities.items()),
-                sorted({(store_no, WAREHOUSE) for _, store_no, _, _ in order.lines}),
-                sorted((store_no, product, float(quantity), float(allocated))
-                       for product, store_no, quantity, allocated in order.lines))
-        elif order.kind == "stored already":
-            store[order.number] = ([(PRODUCTS[-1], 7.0, 1.5)], [(STORES[-1], "")],
+                9 if order.fate == FAULTY else 0,
+                sorted((product, quantity, cost) for (product, cost), (quantity,) in lines.items()),
+                sorted({(place, ship_to) for _, place, ship_to, *_ in order.lines}),
+                sorted((*key, *quantities) for key, quantities in parts.items()))
+        elif order.kind.outlives:
+            store[order.number] = (0, [(PRODUCTS[-1], 7.0, 1.5)], [(STORES[-1], "")],
                                    [(STORES[-1], PRODUCTS[-1], 7.0, 7.0)])
     return store

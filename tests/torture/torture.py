@@ -2,8 +2,9 @@
 disk fail under it, and checks each time that a plain second run leaves every order stored exactly once or still in the
 file.
 
-    run.sh [long]                     everything: a quarter of an hour on two idle cores
-    run.sh short                      a sample, for the tests
+    run.sh [long]                     the model class in full, the others by a sample: 20 minutes on two cores
+    run.sh --class CLASS [long]       one class in full: ten minutes
+    run.sh short                      a small sample of every class, for the tests
     run.sh repeat SCENARIO STRIKE...  one round, its workspace kept
     run.sh failures [NAME...]         the other failures only: locks, vanished files, several programs
 
@@ -26,8 +27,10 @@ import sys
 import tempfile
 import threading
 import time
+from dataclasses import dataclass
 
 import failures
+import order_samples
 import orders
 import verdict
 from workspace import HarnessError, Program, Scenario, trace_of
@@ -59,27 +62,53 @@ class Round:
         return " ".join([self.scenario.name, *self.strikes])
 
 
+@dataclass(frozen=True)
+class Extent:
+    """How many rounds of each sort; None is all there are."""
+    random: int
+    large: int | None      # at the large file's operations
+    small: int | None      # at those of the small files
+    settling: int | None
+    faults: int | None
+    failures: bool = True
+
+
+FULL = Extent(300, None, None, None, None)
+SAMPLE = Extent(40, 40, 250, 250, 120)
+SHORT = Extent(25, 0, 50, 50, 30)
+GLANCE = Extent(0, 0, 25, 25, 15, failures=False)
+
+# large: what a partner sends on a busy day. small: every kind of order, few enough to strike at each operation.
+# emptied: all orders post, and the file goes when it is empty.
+SCENARIOS = {
+    "large": {"count": 500, "products": 8, "stores": 5},
+    "small": {},
+    "emptied": {"count": 4, "plain": True, "options": "#%DELETEONEMPTY"},
+}
+
+
 class Torture:
-    def __init__(self, options, root):
+    """One class under torture."""
+
+    def __init__(self, options, root, order_class):
         self.options = options
         self.root = root
+        self.name = order_class.name
+        self.trade = orders.Trade(order_class)
         self.kept_under = pathlib.Path(os.environ["PARTNERKIT_BUILD"]) / "torture"
-        self.program = Program(os.environ["PARTNERKIT_PROGRAM"], os.environ["PARTNERKIT_BUILD"], options.prog_id)
+        self.program = Program(os.environ["PARTNERKIT_PROGRAM"], os.environ["PARTNERKIT_BUILD"])
         self.rng = random.Random(options.seed)
         self.lock = threading.Lock()
         self.counts = collections.Counter()
         self.found = 0
         self.alike = collections.Counter()
-        # large: what a partner sends on a busy day. small: every kind of order, few enough to strike at each operation.
-        # emptied: all orders post, and the file goes when it is empty.
-        self.scenarios = {
-            "large": self.scenario("large", orders.make_file(500, 8, 5)),
-            "small": self.scenario("small", orders.make_file(25, 2, 2)),
-            "emptied": self.scenario("emptied", orders.make_file(4, 2, 2, plain=True, options="#%DELETEONEMPTY")),
-        }
+        self.prepared = {}
 
-    def scenario(self, name, file):
-        return Scenario(self.program, self.root, name, file)
+    def scenario(self, name):
+        if name not in self.prepared:
+            file = self.trade.make_file(**SCENARIOS[name])
+            self.prepared[name] = Scenario(self.program, self.root, name, file)
+        return self.prepared[name]
 
     # --- One round
 
@@ -118,15 +147,17 @@ class Torture:
             self.alike[alike] += bool(found)
             told = keep or (found and self.alike[alike] <= TOLD)
             if told:
-                print(f"{'VIOLATION: ' if found else ''}./pk torture {text}", *found, sep="\n  ")
+                print(f"{'VIOLATION: ' if found else ''}./pk torture --class {self.name} {text}", *found, sep="\n  ")
                 print(f"  workspace: {self.kept_under / folder.name}", flush=True)
         if told:
             shutil.move(folder, self.kept_under / folder.name)
         else:
             shutil.rmtree(folder)
 
-    def run_all(self, rounds):
+    def run_all(self, about, rounds):
         began = time.monotonic()
+        if rounds:
+            print(f"{about}: {len(rounds)} rounds", flush=True)
         with concurrent.futures.ThreadPoolExecutor(self.options.jobs) as pool:
             for number, _ in enumerate(pool.map(self.run, rounds), 1):
                 if number % 100 == 0:
@@ -136,7 +167,7 @@ class Torture:
 
     def random_kills(self, count):
         """Spread evenly over the run time, which is measured as the rounds will run: several at once."""
-        large = self.scenarios["large"]
+        large = self.scenario("large")
         with concurrent.futures.ThreadPoolExecutor(self.options.jobs) as pool:
             span = statistics.median(pool.map(self.plain_run, [large] * (2 * self.options.jobs)))
             moments = [span * (index + self.rng.random()) / count for index in range(count)]
@@ -155,7 +186,7 @@ class Torture:
     def kill_about(self, moment):
         # A run on an idle moment of the machine may end before its kill comes.
         for _ in range(20):
-            if self.run(Round("random kills", self.scenarios["large"], [f"at:{moment:.4f}"])):
+            if self.run(Round("random kills", self.scenario("large"), [f"at:{moment:.4f}"])):
                 return
             moment *= 0.9
         raise HarnessError("the runs end before they can be killed")
@@ -190,18 +221,16 @@ class Torture:
                 rounds += [Round("operation kills", scenario, [f"{action}:{kind}:{number}"]) for action in EVERY[kind]]
         return rounds
 
-    def settling_kills(self, scenario):
+    def settling_kills(self, scenario, count):
         """Kills round the operations on order file and backup, each followed by a kill in the recovery from it."""
+        firsts = [f"{action}:{kind}:{number}" for kind, number, name in self.numbered(self.traced(scenario))
+                  if name.startswith(SETTLING) for action in EVERY[kind]]
         rounds = []
-        for kind, number, name in self.numbered(self.traced(scenario)):
-            if not name.startswith(SETTLING):
-                continue
-            for action in EVERY[kind]:
-                first = f"{action}:{kind}:{number}"
-                rounds.append(Round("operation kills", scenario, [first]))
-                rounds += [Round("kills in a recovery", scenario, [first, f"kill-before:{then}:{at}"])
-                           for then, at, where in self.numbered(self.traced(scenario, first))
-                           if where.startswith(SETTLING)]
+        for first in self.sample(firsts, count):
+            rounds.append(Round("operation kills", scenario, [first]))
+            rounds += [Round("kills in a recovery", scenario, [first, f"kill-before:{then}:{at}"])
+                       for then, at, where in self.numbered(self.traced(scenario, first))
+                       if where.startswith(SETTLING)]
         return rounds
 
     def faults(self, scenario):
@@ -212,42 +241,37 @@ class Torture:
 
     # --- The forms
 
-    def long(self):
-        self.random_kills(self.options.kills or 300)
-        large, small, emptied = (self.scenarios[name] for name in ("large", "small", "emptied"))
-        for about, rounds in (
-                ("the large file's renames, deletions, syncs and commits",
-                 self.operation_kills(large, ("rename", "unlink", "sync", "truncate", "commit"))),
-                ("every operation of the small file", self.operation_kills(small, EVERY)),
-                ("every operation of the emptied file", self.operation_kills(emptied, EVERY)),
-                ("settling and its recovery", self.settling_kills(small) + self.settling_kills(emptied)),
-                ("faults", self.faults(small) + self.faults(emptied))):
-            print(f"{about}: {len(rounds)} rounds", flush=True)
-            self.run_all(rounds)
-        self.other_failures(slow=True)
-
-    def short(self):
-        self.random_kills(self.options.kills or 25)
-        small, emptied = self.scenarios["small"], self.scenarios["emptied"]
-        rounds = (self.sample(self.operation_kills(small, EVERY), 50) +
-                  self.sample(self.settling_kills(small) + self.settling_kills(emptied), 50) +
-                  self.sample(self.faults(small), 30))
-        self.run_all(rounds)
-        self.other_failures(slow=False)
+    def all_sorts(self, extent, slow):
+        """`slow`: failures that only waiting shows, too."""
+        kills = self.options.kills or extent.random
+        if kills:
+            self.random_kills(kills)
+        if extent.large != 0:
+            rounds = self.operation_kills(self.scenario("large"), ("rename", "unlink", "sync", "truncate", "commit"))
+            self.run_all("renames, deletions, syncs and commits", self.sample(rounds, extent.large))
+        both = [self.scenario("small"), self.scenario("emptied")]
+        for about, count, rounds in (
+                ("every operation", extent.small, lambda each: self.operation_kills(each, EVERY)),
+                ("settling and its recovery", extent.settling,
+                 lambda each: self.settling_kills(each, extent.settling and 1 + extent.settling // 10)),
+                ("faults", extent.faults, self.faults)):
+            self.run_all(about, self.sample([found for each in both for found in rounds(each)], count))
+        if extent.failures:
+            self.other_failures(slow)
 
     def sample(self, rounds, count):
-        return self.rng.sample(rounds, min(count, len(rounds)))
+        return rounds if count is None else self.rng.sample(rounds, min(count, len(rounds)))
 
-    def other_failures(self, slow):
-        for name, folder, found in failures.run(self.program, self.root, slow, self.options.what):
+    def other_failures(self, slow, names=()):
+        for name, folder, found in failures.run(self.program, self.trade, self.root, slow, names):
             self.counts["other failures"] += 1
             self.close(f"failures '{name}'", folder, found)
 
     def repeat(self):
         scenario, *strikes = self.options.what
-        if scenario not in self.scenarios or not strikes:
-            raise HarnessError(f"repeat wants a scenario ({', '.join(self.scenarios)}) and its strikes")
-        self.run(Round("rounds", self.scenarios[scenario], strikes), keep=True)
+        if scenario not in SCENARIOS or not strikes:
+            raise HarnessError(f"repeat wants a scenario ({', '.join(SCENARIOS)}) and its strikes")
+        self.run(Round("rounds", self.scenario(scenario), strikes), keep=True)
 
     def total(self):
         counted = [f"{count} {group}" for group, count in self.counts.items()]
@@ -266,26 +290,39 @@ def main():
     parser = argparse.ArgumentParser(description=__doc__, formatter_class=argparse.RawDescriptionHelpFormatter)
     parser.add_argument("form", nargs="?", default="long", choices=("long", "short", "failures", "repeat"))
     parser.add_argument("what", nargs="*", help="for repeat: SCENARIO STRIKE...; for failures: names")
-    parser.add_argument("--class", dest="prog_id", default="PartnerKit.clsMGB850csv", help="the class, %(default)s")
+    parser.add_argument("--class", dest="named", type=order_samples.order_class,
+                        help="the class; for repeat and failures the model class if none is named")
     parser.add_argument("--seed", type=int, default=1, help="of the random moments and samples, %(default)s")
     parser.add_argument("--kills", type=int, help="how many random kills")
     parser.add_argument("--jobs", type=int, default=os.cpu_count(), help="rounds at once")
     parser.add_argument("--folder", default=default_folder(), help="where the workspaces lie meanwhile, %(default)s")
     options = parser.parse_args()
-    root = pathlib.Path(tempfile.mkdtemp(prefix="partnerkit-torture-", dir=options.folder))
-    try:
-        torture = Torture(options, root)
-        if options.form == "failures":
-            torture.other_failures(slow=True)
-        else:
-            getattr(torture, options.form)()
-    except HarnessError as error:
-        print(f"torture: {error}", file=sys.stderr)
-        return 2
-    finally:
-        shutil.rmtree(root, ignore_errors=True)
-    print(torture.total())
-    return 1 if torture.found else 0
+    classes = [options.named] if options.named else order_samples.order_classes()
+    if options.form in ("repeat", "failures"):
+        del classes[1:]
+    found = 0
+    for order_class in classes:
+        root = pathlib.Path(tempfile.mkdtemp(prefix="partnerkit-torture-", dir=options.folder))
+        torture = Torture(options, root, order_class)
+        model = order_class is classes[0]
+        began = time.monotonic()
+        try:
+            if options.form == "repeat":
+                torture.repeat()
+            elif options.form == "failures":
+                torture.other_failures(True, options.what)
+            elif options.form == "long":
+                torture.all_sorts(FULL if model else SAMPLE, slow=model)
+            else:
+                torture.all_sorts(SHORT if model else GLANCE, slow=False)
+        except HarnessError as error:
+            print(f"torture: {order_class.name}: {error}", file=sys.stderr)
+            return 2
+        finally:
+            shutil.rmtree(root, ignore_errors=True)
+        print(f"{order_class.name}, {time.monotonic() - began:.0f} s: {torture.total()}", flush=True)
+        found += torture.found
+    return 1 if found else 0
 
 
 if __name__ == "__main__":

@@ -4,6 +4,7 @@ import json
 import sqlite3
 
 import orders
+from kinds import KEPT
 from workspace import BACKUP, EARLIER_BACKUP, ORDER_FILE
 
 DATABASE = "partnerkit.db"
@@ -17,7 +18,7 @@ def violations(scenario, folder, program, last, *, settled_once=True, backup=Tru
     if last.err.strip() and "nothing to list" not in last.err:
         found.append(f"the plain run says {last.err.strip()}")
     found += store_violations(folder, orders.expected_store(scenario.file))
-    found += file_violations(scenario, folder)
+    found += file_violations(scenario, folder, last.posted(), settled_once)
     if backup:
         found += backup_violations(scenario, folder, last.posted(), settled_once)
     found += leftovers(scenario, folder)
@@ -44,47 +45,53 @@ def orders_violations(connection, expected):
             found.append(f"{number} is stored twice")
         if number not in expected:
             found.append(f"{number} is stored and should not be")
-        if status != 0:
+        if status != expected.get(number, (0,))[0]:
             found.append(f"{number} is stored with Status {status}")
         stored[number] = key
-    for number, parts in expected.items():
+    for number, (_, *parts) in expected.items():
         if number not in stored:
             found.append(f"{number} is not stored")
         elif parts_of(connection, stored[number]) != parts:
             found.append(f"{number} is stored with other lines, locations or location lines")
     for table, part in (("tbOrderLine", 0), ("tbOrderLocn", 1), ("tbOrderLocnLine", 2)):
         count = connection.execute(f"SELECT COUNT(*) FROM {table}").fetchone()[0]
-        wanted = sum(len(parts[part]) for parts in expected.values())
+        wanted = sum(len(parts[part]) for _, *parts in expected.values())
         if count != wanted:
             found.append(f"{table} holds {count} records instead of {wanted}")
     return found
 
 
 def parts_of(connection, key):
-    return (
+    return [
         sorted(connection.execute("SELECT ProductNo, Quantity, Cost FROM tbOrderLine WHERE OrderId=?", [key])),
         sorted(connection.execute("SELECT BuyingLocn, ShipToLocn FROM tbOrderLocn WHERE OrderId=?", [key])),
         sorted(connection.execute(
             "SELECT c.BuyingLocn, l.ProductNo, q.Quantity, q.AllocateQty FROM tbOrderLocnLine q"
             " JOIN tbOrderLine l ON l.LineId=q.LineId AND l.OrderId=q.OrderId AND l.ProductNo=q.ProductNo"
             " JOIN tbOrderLocn c ON c.LocnId=q.LocnId AND c.OrderId=q.OrderId AND c.BuyingLocn=q.BuyingLocn"
-            " WHERE q.OrderId=?", [key])))
+            " WHERE q.OrderId=?", [key]))]
 
 
 def read(path):
     return path.read_bytes() if path.exists() else b""
 
 
-def file_violations(scenario, folder):
+def file_violations(scenario, folder, posted_last, settled_once):
     content = read(folder / ORDER_FILE)
     kept = scenario.file.kept()
     if content == kept:
         return []
+    if scenario.file.trade.keeps_turned_away:
+        # What the struck runs posted and did not settle.
+        earlier = {order.number for order in scenario.file.posted()} - posted_last
+        left = {order.number for order in scenario.file.posted() if order.texts[0] in content.splitlines(True)}
+        if (left == earlier or (left < earlier and not settled_once)) and content == scenario.file.kept(left):
+            return []
     present = set(content.splitlines(True))
     lost = [order.number for order in scenario.file.orders
-            if order.fate == orders.KEPT and not present.issuperset(order.texts)]
+            if order.fate == KEPT and not present.issuperset(order.texts)]
     left = [order.number for order in scenario.file.orders
-            if order.fate != orders.KEPT and not present.isdisjoint(order.texts)]
+            if order.fate != KEPT and not present.isdisjoint(order.texts)]
     return [f"the order file is not what it should be: {len(content)} bytes instead of {len(kept)};"
             f" lost {lost[:5]}, still there {left[:5]}"]
 
@@ -99,7 +106,7 @@ def backup_violations(scenario, folder, posted_last, settled_once):
         return ["the backup holds a broken or foreign line"]
     if len(set(texts)) != len(texts):
         return ["the backup holds a line twice"]
-    strays = {owners[text].number for text in texts if owners[text].fate != orders.POSTED}
+    strays = {owners[text].number for text in texts if not owners[text].is_stored()}
     if strays:
         return [f"the backup holds orders that were never posted: {sorted(strays)[:5]}"]
     of_last = [orders.whole(text) for order in scenario.file.posted() if order.number in posted_last
@@ -122,6 +129,8 @@ def leftovers(scenario, folder):
         return {str(path.relative_to(top)) for path in top.rglob("*") if path.is_file()}
 
     strange = names(folder) - names(scenario.prepared)
+    if scenario.file.trade.keeps_turned_away:
+        strange.discard("inbox/orders.tmp")  # with nothing to settle, the next rewrite replaces it
     return [f"left over: {sorted(strange)}"] if strange else []
 
 
@@ -132,7 +141,7 @@ def log_violations(folder, program):
     except ValueError:
         return [f"the log cannot be read: status {ended.status}: {ended.err.strip()}"]
     records = log["log"] if isinstance(log, dict) else log
-    completed = [record["Message"] for record in records if record["Message"].endswith("import completed.")]
+    completed = [record["Message"] for record in records if "import completed" in record["Message"]]
     return [] if len(set(completed)) == len(completed) else ["the log has an order completed twice"]
 
 

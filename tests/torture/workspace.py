@@ -3,14 +3,13 @@
 import json
 import os
 import pathlib
+import re
 import shutil
 import signal
 import subprocess
 import tempfile
 import threading
 import time
-
-import orders
 
 HERE = pathlib.Path(__file__).parent
 TIME_LIMIT = 300  # seconds; a run that takes longer hangs
@@ -36,15 +35,14 @@ class Ended:
         return json.loads(self.out)
 
     def posted(self):
-        """The numbers of the orders that the run posted."""
-        report = self.report()
-        return {report["rows"][result["row"]][0] for result in report.get("results", []) if result["result"] > 0}
+        """The numbers of the orders that the run posted, with faults or without."""
+        told = (re.match("PO (.+) import completed", record["Message"]) for record in self.report()["log"])
+        return {match[1] for match in told if match}
 
 
 class Program:
-    def __init__(self, path, build, prog_id):
+    def __init__(self, path, build):
         self.path = os.path.abspath(path)
-        self.prog_id = prog_id
         self.shim = self._build_shim(pathlib.Path(build) / "torture")
 
     @staticmethod
@@ -131,10 +129,10 @@ class Scenario:
         self.file = file
         self.prepared = pathlib.Path(root) / f"prepared-{name}"
         must(program.run(root, "new", str(self.prepared)))
-        (self.prepared / "records.json").write_text(orders.records(file, program.prog_id, **how))
+        (self.prepared / "records.json").write_text(file.trade.records(file, **how))
         must(program.run(self.prepared, "data", "load", "records.json"))
         (self.prepared / "records.json").unlink()
-        (self.prepared / "maps" / "orders.map").write_text("\n".join(orders.MAP) + "\n")
+        (self.prepared / "maps" / "orders.map").write_text("\n".join(file.trade.order_class.columns) + "\n")
         (self.prepared / ORDER_FILE).write_bytes(file.content())
         (self.prepared / BACKUP).write_bytes(EARLIER_BACKUP)
 

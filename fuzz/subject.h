@@ -1,0 +1,110 @@
+// The class that is fuzzed, named in PARTNERKIT_FUZZ_CLASS, with the map, the orders and the records of its sample.
+#pragma once
+
+#include <algorithm>
+#include <cstdio>
+#include <cstdlib>
+#include <memory>
+#include <nlohmann/json.hpp>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "cli/demo.h"
+#include "cli/record_json.h"
+#include "partnerkit/records.h"
+
+namespace partnerkit::fuzz {
+
+inline void Check(bool holds, const char* what) {
+  if (holds) return;
+  std::fprintf(stderr, "does not hold: %s\n", what);
+  std::abort();
+}
+
+// How a class departs from the norm in what stays in the file.
+struct ClassRules {
+  std::string_view name;
+  bool deletesEnvelopes = false;
+  bool quotesProtectCommas = false;
+  bool settlesByControls = false;
+  bool cancelsInFile = false;  // a cancellation stays in the file
+  bool releases = false;       // a release goes by its version, too
+  bool dropsBlankLines = false;
+  bool shortNumbers = false;       // a short number goes by its ship-to, too
+  bool keepsForeignLines = false;  // also those of a number that was dealt with
+  bool keepsTurnedAway = false;
+  bool linesMayNotCount = false;  // an order may be left without lines
+};
+
+// clang-format off
+inline constexpr ClassRules kClassRules[] = {
+    {.name = "PartnerKit.clsMGB850csv", .deletesEnvelopes = true},
+    {.name = "PartnerKit.clsMYERDropShipPOcsv", .deletesEnvelopes = true},
+    {.name = "PartnerKit.clsMGBBT850csv", .quotesProtectCommas = true, .settlesByControls = true, .cancelsInFile = true},
+    {.name = "PartnerKit.clsKMart850csv", .cancelsInFile = true, .releases = true, .dropsBlankLines = true, .linesMayNotCount = true},
+    {.name = "PartnerKit.clsCMLFLFPOcsv", .shortNumbers = true, .keepsForeignLines = true, .keepsTurnedAway = true, .linesMayNotCount = true},
+    {.name = "PartnerKit.clsTargetBulkPOcsv", .keepsForeignLines = true, .keepsTurnedAway = true, .linesMayNotCount = true},
+};
+// clang-format on
+
+struct Subject {
+  std::string progId;
+  ClassRules rules;
+  std::string map;
+  std::string orders;
+  EDIDoc document;
+  std::vector<std::pair<const RecordType*, std::shared_ptr<void>>> records;  // all others
+};
+
+inline std::string_view Sample(const std::string& path) {
+  const auto files = cli::DemoFiles();
+  const auto found = std::ranges::find(files, path, &cli::DemoFile::path);
+  return found == files.end() ? std::string_view() : found->text;
+}
+
+inline void TakeRecords(const nlohmann::json& data, Subject& subject) {
+  for (const auto& [kind, records] : data.items()) {
+    const RecordType* const type = FindRecordType(kind);
+    if (type == nullptr) continue;
+    for (const nlohmann::json& given : records) {
+      const std::shared_ptr<void> record = cli::NewRecord(*type);
+      for (const auto& [name, value] : given.items()) {
+        cli::SetMember(*cli::FindMember(*type, name), record.get(), value, ".");
+      }
+      if (type == &EDIDoc::kType) {
+        subject.document = *static_cast<const EDIDoc*>(record.get());
+      } else {
+        subject.records.emplace_back(type, record);
+      }
+    }
+  }
+}
+
+inline Subject ReadSubject() {
+  Subject subject;
+  const char* const named = std::getenv("PARTNERKIT_FUZZ_CLASS");
+  subject.progId = named == nullptr ? "PartnerKit.clsMGB850csv" : named;
+  const auto rules = std::ranges::find(kClassRules, subject.progId, &ClassRules::name);
+  if (rules != std::end(kClassRules)) subject.rules = *rules;
+  for (const cli::DemoFile& file : cli::DemoFiles()) {
+    if (!file.path.ends_with(".json")) continue;
+    const auto data = nlohmann::json::parse(file.text);
+    if (data["EDIDoc"][0]["ProgId"] == subject.progId) TakeRecords(data, subject);
+  }
+  Check(!subject.records.empty(), "there is a sample of the class");
+  const std::string mapFile(Str(subject.document.MapFile));
+  const std::string name = mapFile.substr(0, mapFile.find('.'));
+  subject.map = Sample("maps/" + mapFile);
+  subject.orders = Sample("inbox/" + name + ".csv");
+  if (subject.orders.empty()) subject.orders = Sample("inbox/orders.csv");
+  return subject;
+}
+
+inline const Subject& TheSubject() {
+  static const Subject kSubject = ReadSubject();
+  return kSubject;
+}
+
+}  // namespace partnerkit::fuzz
