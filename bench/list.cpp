@@ -1,8 +1,9 @@
 // How long `Load` takes to list an order file, apart from the start of the program and from what follows on it.
-//   list CLASS WORKSPACE FILE
+//   list CLASS WORKSPACE DOCUMENT FILE
 #include <sys/resource.h>
 
 #include <cstdio>
+#include <cstdlib>
 
 #include "host/sql_host.h"
 #include "partnerkit/catalogue.h"
@@ -11,17 +12,17 @@
 
 int main(int count, char** arguments) {
   using namespace partnerkit;
-  if (count != 4) {
-    std::fputs("usage: list CLASS WORKSPACE FILE\n", stderr);
+  if (count != 5) {
+    std::fputs("usage: list CLASS WORKSPACE DOCUMENT FILE\n", stderr);
     return 2;
   }
   const auto host = host::SqlHost::Open(std::string(arguments[2]) + "/partnerkit.db");
   const auto importer = CreateTranslator(arguments[1], platform::DefaultPorts());
   ColumnTable columns;
   RowTable rows;
-  if (!importer || !importer->Init(*host, 1, columns)) return 1;
+  if (!importer || !importer->Init(*host, static_cast<std::int16_t>(std::atoi(arguments[3])), columns)) return 1;
   const Stopwatch watch;
-  const std::int32_t listed = importer->Load(arguments[3], rows);
+  const std::int32_t listed = importer->Load(arguments[4], rows);
   const double seconds = watch.Elapsed(), busy = watch.Busy();
   rusage usage{};
   getrusage(RUSAGE_SELF, &usage);

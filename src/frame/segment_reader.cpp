@@ -1,6 +1,7 @@
 #include "frame/segment_reader.h"
 
 #include <algorithm>
+#include <bit>
 #include <cstring>
 #include <span>
 
@@ -11,6 +12,15 @@ namespace {
 // What is kept of an overlong segment: enough to tell what it is.
 constexpr std::size_t kFront = 256;
 
+constexpr std::uint64_t kOnes = 0x0101010101010101;
+
+constexpr std::uint64_t Repeated(char c) { return kOnes * static_cast<unsigned char>(c); }
+
+// The high bit of each byte below `limit`, which is at most 128. Bytes behind the first such may be marked wrongly.
+constexpr std::uint64_t Below(std::uint64_t bytes, unsigned limit) {
+  return (bytes - kOnes * limit) & ~bytes & (kOnes * 0x80);
+}
+
 bool IsLineEnd(char c) { return c == '\r' || c == '\n'; }
 
 }  // namespace
@@ -18,12 +28,11 @@ bool IsLineEnd(char c) { return c == '\r' || c == '\n'; }
 SegmentReader::SegmentReader(InputFile& file, const SegmentSyntax& syntax, std::size_t block)
     : file_(file), syntax_(syntax), buffer_(block) {
   for (const char end : {'\r', '\n', syntax.terminator, syntax.otherEnd}) {
-    if (end != '\0') ends_.push_back({end});
+    if (end != '\0') ends_[static_cast<unsigned char>(end)] = true;
   }
 }
 
 void SegmentReader::Seek(std::uint64_t position) {
-  ForgetEnds();
   const std::uint64_t offset = position - 1;
   if (offset >= base_ && offset <= base_ + filled_) {
     begin_ = static_cast<std::size_t>(offset - base_);
@@ -60,23 +69,27 @@ bool SegmentReader::SkipLineEnds() {
   return false;
 }
 
-// The next byte that ends a segment, or `filled_`. What was found is remembered: in a file of one line, the line ends
-// would otherwise be searched for to the end of the buffer for every segment.
-std::size_t SegmentReader::FindEnd(std::size_t from) {
-  std::size_t first = filled_;
-  for (End& end : ends_) {
-    if (!end.known || end.next < from) {
-      const void* const at = from < filled_ ? std::memchr(buffer_.data() + from, end.byte, filled_ - from) : nullptr;
-      end.next = at ? static_cast<std::size_t>(static_cast<const char*>(at) - buffer_.data()) : filled_;
-      end.known = true;
+// The next byte that ends a segment, or `filled_`. Eight bytes are looked at together: of those that are a terminator,
+// the other end or some control character, the first is found by its bit, and then asked whether it ends one.
+std::size_t SegmentReader::FindEnd(std::size_t from) const {
+  const char* const bytes = buffer_.data();
+  if constexpr (std::endian::native == std::endian::little) {
+    const std::uint64_t terminator = Repeated(syntax_.terminator), other = Repeated(syntax_.otherEnd);
+    while (from + sizeof(std::uint64_t) <= filled_) {
+      std::uint64_t eight;
+      std::memcpy(&eight, bytes + from, sizeof eight);
+      const std::uint64_t found = Below(eight, '\r' + 1) | Below(eight ^ terminator, 1) | Below(eight ^ other, 1);
+      if (found == 0) {
+        from += sizeof eight;
+        continue;
+      }
+      from += static_cast<std::size_t>(std::countr_zero(found)) / 8;
+      if (ends_[static_cast<unsigned char>(bytes[from])]) return from;
+      ++from;
     }
-    first = std::min(first, end.next);
   }
-  return first;
-}
-
-void SegmentReader::ForgetEnds() {
-  for (End& end : ends_) end.known = false;
+  while (from < filled_ && !ends_[static_cast<unsigned char>(bytes[from])]) ++from;
+  return from;
 }
 
 // Brings more of the file into the buffer, which grows when one segment fills it. False at the end of the file. What
@@ -90,7 +103,6 @@ bool SegmentReader::Fill() {
   } else if (filled_ == buffer_.size()) {
     buffer_.resize(buffer_.size() * 2);
   }
-  ForgetEnds();
   const std::size_t read = file_.ReadAt(base_ + filled_, std::span(buffer_).subspan(filled_));
   filled_ += read;
   return read > 0;

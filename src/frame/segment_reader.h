@@ -1,6 +1,7 @@
 // Reads the segments of a held file in large blocks, each with its byte positions: one reader for every syntax.
 #pragma once
 
+#include <array>
 #include <cstdint>
 #include <string_view>
 #include <vector>
@@ -47,24 +48,15 @@ class SegmentReader {
 
  private:
   bool SkipLineEnds();
-  std::size_t FindEnd(std::size_t from);
-  void ForgetEnds();
+  std::size_t FindEnd(std::size_t from) const;
   void GoBehind(std::size_t end);
   bool Fill();
   Segment Give(std::size_t end);
   Segment GiveOverlong();
 
-  // A byte that ends segments, and where the next one is: at or behind `begin_`, or `filled_` when the buffer holds
-  // none.
-  struct End {
-    char byte;
-    std::size_t next = 0;
-    bool known = false;
-  };
-
   InputFile& file_;
   SegmentSyntax syntax_;
-  std::vector<End> ends_;
+  std::array<bool, 256> ends_{};
   std::vector<char> buffer_;
   std::uint64_t base_ = 0;   // file offset of the buffer's first byte
   std::size_t begin_ = 0;    // of the next segment in the buffer
