@@ -4,24 +4,28 @@
 #include <cctype>
 #include <string_view>
 
+#include "frame/delimited.h"
+
 namespace partnerkit::orders {
 
 namespace {
 
-bool IsAcknowledgement(std::string_view documentCode) {
+bool IsAcknowledgement(std::string_view documentCode, CodeForm form) {
+  const bool anyCase = form == CodeForm::kTrimmedAnyCase;
   if (documentCode == "855" || documentCode == "ORDRSP") return true;
-  std::string upper(documentCode);
+  std::string upper(anyCase ? TrimBlanks(documentCode) : documentCode);
   std::ranges::transform(upper, upper.begin(), [](unsigned char c) { return static_cast<char>(std::toupper(c)); });
-  return upper == "POA" || upper == "SO";
+  return upper == "POA" || upper == "SO" || (anyCase && (upper == "855" || upper == "ORDRSP"));
 }
 
 }  // namespace
 
-bool HasOrderAcknowledgement(TranslatorBase& translator) {
+bool HasOrderAcknowledgement(TranslatorBase& translator, CodeForm form) {
   const EDIDoc& own = translator.Document();
   const auto documents = translator.Try([&] { return translator.Host().EDIDocList(); });
   return std::ranges::any_of(documents, [&](const EDIDoc& other) {
-    return other.PartnerId == own.PartnerId && other.VendorId == own.VendorId && IsAcknowledgement(other.DocumentCode);
+    return other.PartnerId == own.PartnerId && other.VendorId == own.VendorId &&
+           IsAcknowledgement(other.DocumentCode, form);
   });
 }
 

@@ -95,6 +95,23 @@ TEST_F(WorkQueueTest, LeavesAFileThatTookTheOrderFilesPlace) {
   EXPECT_EQ(folder_.Read("orders.txt.kept"), "a\n");
 }
 
+TEST_F(WorkQueueTest, KeepsRangesAndRemovesAFinishedFile) {
+  for (const bool withTemporary : {true, false}) {
+    Open("a~b~" + std::string(300'000, 'c') + "~d");
+    WorkQueue::Rewrite rewrite(queue_);
+    rewrite.Begin();
+    rewrite.KeepRange({3, 300'006});
+    rewrite.KeepRange({1, 1});
+    EXPECT_EQ(NumberRaised([&] { rewrite.KeepRange({300'006, 300'008}); }), 62);
+    rewrite.Claim();
+    rewrite.Remove(withTemporary);
+    EXPECT_FALSE(folder_.Has("orders.txt"));
+    EXPECT_EQ(folder_.Has("orders.tmp"), !withTemporary);
+    EXPECT_EQ(folder_.Read("orders.tmp"), withTemporary ? "" : "b~" + std::string(300'000, 'c') + "~d");
+    queue_.Close();
+  }
+}
+
 TEST_F(WorkQueueTest, IsHeldAgainstOtherPrograms) {
   folder_.Write("orders.txt", "a\n");
   {

@@ -187,8 +187,6 @@ TEST(CsvPostingTest, TakesPurposesWithNothingStored) {
 // Keeps a line from making its product.
 const std::string kNoStyle = "; STYLE=; COLOUR=; SIZE=";
 
-enum Validate { kNothing = 0, kProduct = 1, kCost = 2, kRetail = 4, kAll = 7 };
-
 TEST(CsvPostingTest, TellsEveryFaultOfAnOrderAndKeepsIt) {
   const std::string missing = "INCOMINGPRODUCTNO=93009";
   const std::string noProduct = Refused("product 93009 does not exist.");
@@ -241,9 +239,7 @@ TEST(CsvPostingTest, TellsEveryFaultOfAnOrderAndKeepsIt) {
   for (const auto& c : cases) {
     SCOPED_TRACE(c.what);
     CsvTrade trade(c.className);
-    trade.document.ValidateProduct = (c.validate & kProduct) != 0;
-    trade.document.ValidateCost = (c.validate & kCost) != 0;
-    trade.document.ValidateRetail = (c.validate & kRetail) != 0;
+    Set(trade.document, c.validate);
     for (const auto& [number, partner] : {std::pair("93001", "MGB"), std::pair("93005", "MYER")}) {
       trade.Stored(With<Product>([&, number = number, partner = partner](Product& product) {
         product.ProductNo = number;

@@ -346,6 +346,31 @@ TEST_F(PosixFilesTest, RenamesInThePlaceOfAFileThatSomebodyReads) {
   EXPECT_EQ(Bytes(Path("folder/moved.csv")), "new");
 }
 
+TEST_F(PosixFilesTest, CopiesIntoThePlaceOfAnOlderFile) {
+  PosixFiles files;
+  files.CreateFolder(Path("archive"));
+  EXPECT_EQ(NumberOf([&] { files.CreateFolder(Path("archive")); }), run_time::kPathAccess);
+  EXPECT_EQ(NumberOf([&] { files.CreateFolder(Path("gone/archive")); }), run_time::kPathNotFound);
+  const std::string from = Put("orders.txt", std::string(300'000, 'o')), to = Put("archive/orders.txt", "older");
+  const auto held = files.OpenInput(from, Share::kExclusive);
+  files.Copy(from, to);
+  EXPECT_EQ(Bytes(to), std::string(300'000, 'o'));
+  const struct {
+    std::string from, to;
+    int number;
+  } cases[] = {
+      {"none.txt", "archive/orders.txt", run_time::kFileNotFound}, {"archive", "copy", run_time::kPathAccess},
+      {"orders.txt", "gone/orders.txt", run_time::kPathNotFound},  {"orders.txt", "archive", run_time::kPathAccess},
+      {"orders.txt", "orders.txt", run_time::kPathAccess},
+  };
+  for (const auto& c : cases) {
+    EXPECT_EQ(NumberOf([&] { files.Copy(Path(c.from), Path(c.to)); }), c.number) << c.from << " to " << c.to;
+  }
+  EXPECT_EQ(Bytes(to), std::string(300'000, 'o'));
+  EXPECT_EQ(Bytes(from), Bytes(to));
+  EXPECT_EQ(std::distance(std::filesystem::directory_iterator(folder_), {}), 2);
+}
+
 TEST_F(PosixFilesTest, TakesABackslashForASeparatorUnlessAFileBearsThatName) {
   std::filesystem::create_directory(Path("in"));
   std::filesystem::create_directory(Path("od\\d"));

@@ -122,13 +122,4 @@ struct Siblings : CsvTrade {
   }
 };
 
-// What a document definition asks to be checked.
-enum Validate { kNothing = 0, kProduct = 1, kCost = 2, kRetail = 4, kAll = 7 };
-
-inline void Set(EDIDoc& document, int validate) {
-  document.ValidateProduct = (validate & kProduct) != 0;
-  document.ValidateCost = (validate & kCost) != 0;
-  document.ValidateRetail = (validate & kRetail) != 0;
-}
-
 }  // namespace partnerkit::testing

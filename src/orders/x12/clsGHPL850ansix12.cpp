@@ -13,6 +13,7 @@ constexpr X12OrderValues kValues{
     .keepsBareSegments = false,
     .archives = false,
     .addressesOf13 = true,
+    .longestControl = 9,
     .n1Form = {ElementForm::kSpan, 17},
     .productForm = {ElementForm::kSpan, 30},
     .countsLines = true,

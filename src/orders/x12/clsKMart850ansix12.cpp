@@ -62,7 +62,7 @@ clsKMart850ansix12::clsKMart850ansix12(const Ports& ports) : X12OrderImporter(kV
 
 bool clsKMart850ansix12::Init(System& system, std::int16_t EDIDocId, ColumnTable& Columns) {
   const bool bound = X12OrderImporter::Init(system, EDIDocId, Columns);
-  answersOrders_ = bound && HasOrderAcknowledgement(*this);
+  answersOrders_ = bound && HasOrderAcknowledgement(*this, CodeForm::kTrimmedAnyCase);
   return bound;
 }
 

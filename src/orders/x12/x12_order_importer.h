@@ -107,6 +107,7 @@ class X12OrderImporter : public OrderImporter {
   std::optional<SegmentReader> segments_;
   std::string interchangeCtl_, groupCtl_;  // of the envelope in hand while listing
   bool listedWhole_ = false;
+  std::uint64_t listedTo_ = 1;  // the file's end when it was listed, from 1
 };
 
 }  // namespace partnerkit::orders

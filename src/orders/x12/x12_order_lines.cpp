@@ -74,7 +74,8 @@ void X12OrderImporter::TakeRetail(Posting& posting) {
 void X12OrderImporter::TakePack(Posting& posting) {
   if ((values_.packNumbers.empty() && !values_.packUOM) || !HasLine(posting)) return;
   for (const PackNumber& number : values_.packNumbers) {
-    const std::string text = ElementOrEnd(number.element, {ElementForm::kLast});
+    const bool ends = segment_.PosBegSplat(number.element + 1) == 0;
+    const std::string text = Element(number.element, ends ? ElementForm{ElementForm::kLast} : ElementForm{});
     if (!text.empty()) *posting.line.*number.member = NumberOf(text);
   }
   if (values_.packUOM) posting.line->PackUOM = NullIfEmpty(Element(3, *values_.packUOM));

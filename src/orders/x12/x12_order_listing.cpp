@@ -74,6 +74,7 @@ bool X12OrderImporter::WalkFile() {
       listed_.push_back(std::move(entry));
     }
   }
+  listedTo_ = Segments().Position();
   return !walk.InOrders() || ProcessFA(gs, transactions);
 }
 
@@ -81,7 +82,8 @@ ListedOrder X12OrderImporter::BeginEntry() {
   ListedOrder entry;
   entry.InterchangeCtl = interchangeCtl_;
   entry.GroupCtl = groupCtl_;
-  entry.TransactionCtl = Try([&] { return std::string(segment_.Rest(8)); });
+  entry.TransactionCtl =
+      Try([&] { return std::string(TrimBlanks(segment_.Rest(8).substr(0, values_.longestControl))); });
   entry.FilePos = static_cast<std::int64_t>(segment_.End());
   return entry;
 }

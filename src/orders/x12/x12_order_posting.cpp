@@ -9,6 +9,14 @@
 
 namespace partnerkit::orders {
 
+namespace {
+
+// The transaction ends here: at its SE, or where the file was cut short and goes on with something else. What follows
+// is never taken for a part of it.
+bool EndsTransaction(std::string_view tag) { return IsOneOf(tag, "SE* ST* GE* GS* IEA ISA"); }
+
+}  // namespace
+
 std::int32_t X12OrderImporter::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
   return Procedure("Function Process", std::int32_t{0}, [&](std::int32_t& orderId) {
     ListedOrder* const entry = EntryOfRow(a_lRowNum);
@@ -32,7 +40,7 @@ std::int32_t X12OrderImporter::Process(std::int32_t a_lRowNum, ErrorList& vtErro
 }
 
 // Reads and checks the transaction's segments. Nothing is stored here: an order goes in whole or not at all. A
-// transaction without its CTT was cut short; what stands behind its SE is never taken for a part of it.
+// transaction without its CTT was cut short.
 X12OrderImporter::Next X12OrderImporter::ReadTransaction(Posting& posting) {
   while (NextSegment()) {
     const std::string_view tag = segment_.Text().substr(0, 3);
@@ -43,7 +51,7 @@ X12OrderImporter::Next X12OrderImporter::ReadTransaction(Posting& posting) {
     } else if (tag == "CTT") {
       posting.complete = true;
       return Distribute(posting);
-    } else if (tag == "SE*") {
+    } else if (EndsTransaction(tag)) {
       break;
     } else if (tag == "DTM") {
       TakeDate(posting.draft.header);
@@ -113,7 +121,7 @@ void X12OrderImporter::TakeDate(Order& order) {
 // Only the dates of an order in work can still be changed.
 X12OrderImporter::Next X12OrderImporter::ChangeStored(OrderPosting& posting, Order& stored) {
   while (NextSegment()) {
-    if (segment_.Begins("SE*")) break;
+    if (EndsTransaction(segment_.Text().substr(0, 3))) break;
     if (segment_.Begins("DTM")) TakeDate(stored);
     if (!segment_.Begins("CTT")) continue;
     const bool changed = Try([&] {

@@ -72,7 +72,8 @@ class X12OrderImporter::Sweep {
     while (importer_.ReadSegment()) {
       const X12Segment& segment = importer_.segment_;
       const X12Walk::Event event = walk_.Take(segment);
-      if (IsForeign(segment)) {
+      NoteAdded(segment);
+      if (added_ || IsForeign(segment)) {
         KeepUntouched(segment);
       } else {
         CopyUntouched(segment.Begin());
@@ -82,12 +83,18 @@ class X12OrderImporter::Sweep {
     std::uint64_t end = importer_.Segments().Position();
     CopyUntouched(end);
     rewrite_.Finish();
-    // A mailbox that doesn't ask for the hold may have added to the file meanwhile.
+    // The mailbox may still be at it.
     for (std::uint64_t length; (length = importer_.queue_.File().Length()) >= end; end = length + 1) {
       rewrite_.KeepRange({end, length + 1});
       rewrite_.Finish();
       anyLeft_ = true;
     }
+  }
+
+  // A mailbox that doesn't ask for the hold may have added to the file since it was listed. What it added of a group is
+  // settled with it; later groups were neither listed nor acknowledged, and stay as they are for the next run.
+  void NoteAdded(const X12Segment& segment) {
+    if (segment.End() > importer_.listedTo_ && (segment.Begins("ISA") || segment.Begins("GS"))) added_ = true;
   }
 
   bool IsForeign(const X12Segment& segment) const {
@@ -96,7 +103,7 @@ class X12OrderImporter::Sweep {
       case X12Walk::Place::kOtherGroup:
         return true;
       case X12Walk::Place::kOutside:
-        return !IsBlank(segment.Text());
+        return untouchedFrom_ != 0 || !IsBlank(segment.Text());
       default:
         return false;
     }
@@ -104,7 +111,7 @@ class X12OrderImporter::Sweep {
 
   void KeepUntouched(const X12Segment& segment) {
     if (untouchedFrom_ != 0) return;
-    if (walk_.At() == X12Walk::Place::kOtherGroup) WriteHeld(interchange_);
+    if (segment.Begins("GS")) WriteHeld(interchange_);
     untouchedFrom_ = segment.Begin();
     anyLeft_ = true;
   }
@@ -185,6 +192,7 @@ class X12OrderImporter::Sweep {
   bool keep_ = true;
   bool inTransaction_ = false;
   bool anyLeft_ = false;
+  bool added_ = false;  // the segments in hand came after the listing
   std::uint64_t untouchedFrom_ = 0;
 };
 

@@ -74,7 +74,8 @@ struct X12OrderValues {
   std::string_view groups = "PO";  // functional codes of the groups of orders, a blank between them
   std::string_view sets = "850";
   std::string_view beginnings = "BEG";
-  bool keepsSourceFile = false;  // an order knows the file it came in
+  std::size_t longestControl = std::string_view::npos;  // characters of a transaction's control number
+  bool keepsSourceFile = false;                         // an order knows the file it came in
 
   // Posting.
   std::span<const OrderRule> storedOrder = kUsualX12StoredOrder;

@@ -1,5 +1,8 @@
 #include "orders/x12/x12_walk.h"
 
+#include <cstdint>
+#include <limits>
+
 #include "frame/delimited.h"
 
 namespace partnerkit::orders {
@@ -54,7 +57,8 @@ X12Walk::Event X12Walk::TakeInOrders(const X12Segment& segment) {
 }
 
 bool X12Walk::IsOurs(const X12Segment& isa) const {
-  if (isa.Overlong() || isa.SplatCount() < 8) return false;
+  // Beyond that its elements have no positions, and it is rubbish.
+  if (isa.Length() > std::numeric_limits<std::int16_t>::max() || isa.SplatCount() < 8) return false;
   return SameAddress(isa, 6, partnerAddress_) && SameAddress(isa, 8, companyAddress_);
 }
 
