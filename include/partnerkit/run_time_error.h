@@ -32,6 +32,7 @@ inline constexpr std::int32_t kPathNotFound = 76;
 inline constexpr std::int32_t kNotSet = 91;
 inline constexpr std::int32_t kCannotCreate = 429;
 inline constexpr std::int32_t kKeyInUse = 457;
+inline constexpr std::int32_t kPrinter = 482;
 inline constexpr std::int32_t kDatabase = 40002;  // the database layer's error; the database's own number is beside it
 }  // namespace run_time
 

@@ -10,6 +10,7 @@
 #include "cli/demo.h"
 #include "cli/json_writer.h"
 #include "cli/listings.h"
+#include "cli/printers.h"
 #include "cli/run_document.h"
 #include "cli/workspace.h"
 #include "partnerkit/version.h"
@@ -55,6 +56,7 @@ class Verbs {
     AddWorkspaceVerbs();
     AddDataVerbs();
     AddRunVerbs();
+    AddPrinterVerbs();
   }
 
   CLI::App& App() { return app_; }
@@ -135,6 +137,15 @@ class Verbs {
         ->type_name("N");
   }
 
+  void AddPrinterVerbs() {
+    CLI::App* verb = Add(app_, "printers", "List the printers and whether they can be reached",
+                         "printers --test warehouse", [this](const Command& command) {
+                           return test_ ? TestPrinters(command, words_) : ListPrinters(command, words_);
+                         });
+    verb->add_option("NAME", words_, "Printers; all of them when none is named")->type_name("");
+    verb->add_flag("--test", test_, "Send a short text to the printers named");
+  }
+
   Options& options_;
   CLI::App app_{"Trading-partner documents: orders in, ship notices and labels out."};
   Action action_;
@@ -143,6 +154,7 @@ class Verbs {
   std::vector<std::int64_t> rows_;
   std::int64_t row_ = 0;
   std::int32_t since_ = 0;
+  bool test_ = false;
 };
 
 // The sentence for a command line that doesn't parse.

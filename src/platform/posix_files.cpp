@@ -8,11 +8,11 @@
 #include <algorithm>
 #include <cerrno>
 #include <cstdio>
-#include <cstring>
 #include <limits>
-#include <optional>
 #include <string_view>
 #include <utility>
+
+#include "platform/posix_calls.h"
 
 namespace partnerkit::platform {
 
@@ -29,114 +29,11 @@ constexpr std::uint64_t kWriteBehind = 8 * 1024 * 1024;
 // How often a file that is replaced while it is being opened is tried again.
 constexpr int kOpenAttempts = 5;
 
-// clang-format off
-constexpr std::pair<std::int32_t, std::string_view> kWordings[] = {
-    {run_time::kOutOfMemory,      "Out of memory"},
-    {run_time::kBadFileName,      "Bad file name or number"},
-    {run_time::kFileNotFound,     "File not found"},
-    {run_time::kDeviceError,      "Device I/O error"},
-    {run_time::kDiskFull,         "Disk full"},
-    {run_time::kTooManyFiles,     "Too many files"},
-    {run_time::kPermissionDenied, "Permission denied"},
-    {run_time::kPathAccess,       "Path/File access error"},
-    {run_time::kPathNotFound,     "Path not found"},
-};
-
-constexpr std::pair<int, std::int32_t> kNumbers[] = {
-    {ENOENT,       run_time::kFileNotFound},
-    {ENOTDIR,      run_time::kPathNotFound},
-    {ENAMETOOLONG, run_time::kBadFileName},
-    {EACCES,       run_time::kPathAccess},
-    {EPERM,        run_time::kPathAccess},
-    {EROFS,        run_time::kPathAccess},
-    {EISDIR,       run_time::kPathAccess},
-    {EBUSY,        run_time::kPermissionDenied},
-    {ETXTBSY,      run_time::kPermissionDenied},
-    {EWOULDBLOCK,  run_time::kPermissionDenied},
-    {ENOSPC,       run_time::kDiskFull},
-    {EDQUOT,       run_time::kDiskFull},
-    {EFBIG,        run_time::kDiskFull},
-    {EMFILE,       run_time::kTooManyFiles},
-    {ENFILE,       run_time::kTooManyFiles},
-    {ENOMEM,       run_time::kOutOfMemory},
-    {EIO,          run_time::kDeviceError},
-    {ENXIO,        run_time::kDeviceError},
-    {ENODEV,       run_time::kDeviceError},
-};
-// clang-format on
-
-// The row of a table of pairs, or `otherwise` where there is none.
-template <class Table, class Value>
-Value LookUp(const Table& table, int key, Value otherwise) {
-  for (const auto& [known, value] : table) {
-    if (known == key) return value;
-  }
-  return otherwise;
-}
-
-[[noreturn]] void Raise(std::int32_t number, std::string path, std::string_view cause) {
-  // The description goes into one-line logs.
-  std::ranges::replace_if(
-      path, [](unsigned char c) { return c < ' ' || c == 0x7F; }, '?');
-  throw RunTimeError(
-      number, std::string(LookUp(kWordings, number, std::string_view())) + ": " + path + ": " + std::string(cause));
-}
-
-std::string Folder(const std::string& native) {
-  const std::size_t slash = native.find_last_of('/');
-  if (slash == std::string::npos) return ".";
-  return slash == 0 ? "/" : native.substr(0, slash);
-}
-
-bool FolderMissing(const std::string& native) {
-  struct stat folder {};
-  return stat(Folder(native).c_str(), &folder) != 0 && (errno == ENOENT || errno == ENOTDIR);
-}
-
-// `otherwise` is the number of a cause that has none of its own.
-[[noreturn]] void RaiseCause(int cause, const std::string& native, std::int32_t otherwise) {
-  // Never in the language of the process locale, unlike strerror.
-  const char* words = strerrordesc_np(cause);
-  const std::int32_t number =
-      cause == ENOENT && FolderMissing(native) ? run_time::kPathNotFound : LookUp(kNumbers, cause, otherwise);
-  Raise(number, native, words == nullptr ? "unknown cause" : words);
-}
-
-template <class F>
-auto Uninterrupted(F call) {
-  for (;;) {
-    const auto result = call();
-    if (result != -1 || errno != EINTR) return result;
-  }
-}
-
 // The native form of a path that a call of the system may be given.
 std::string Checked(const std::string& path) {
   if (path.find('\0') != std::string::npos) Raise(run_time::kBadFileName, path, "A name cannot hold a NUL byte");
   return NativePath(path);
 }
-
-class Descriptor {
- public:
-  Descriptor() = default;
-  explicit Descriptor(int number) : number_(number) {}
-  Descriptor(Descriptor&& other) noexcept : number_(std::exchange(other.number_, -1)) {}
-  Descriptor& operator=(Descriptor&& other) noexcept {
-    std::swap(number_, other.number_);
-    return *this;
-  }
-  ~Descriptor() {
-    if (number_ != -1) ::close(number_);
-  }
-
-  int Number() const { return number_; }
-  bool IsOpen() const { return number_ != -1; }
-  // The descriptor is gone whatever the answer, an interrupted call included: another file may have its number by now.
-  int Close() { return ::close(std::exchange(number_, -1)) == 0 || errno == EINTR ? 0 : errno; }
-
- private:
-  int number_ = -1;
-};
 
 struct stat StatusOf(int descriptor, const std::string& native) {
   struct stat status {};
@@ -245,6 +142,32 @@ class FolderOf {
   std::string path_;
   Descriptor opened_;
 };
+
+// Gives `from` the name `to` by `rename`, durable when it returns: 0, or EEXIST for a name that `rename` finds taken.
+template <class F>
+int RenameBy(F rename, const std::string& from, const std::string& to) {
+  const std::string nativeFrom = Checked(from);
+  const std::string nativeTo = Checked(to);
+  // Opened first: an error that came after the renaming could not be answered by doing it again.
+  const FolderOf oldFolder(nativeFrom);
+  const FolderOf newFolder(nativeTo);
+  if (rename(nativeFrom.c_str(), nativeTo.c_str()) != 0) {
+    const int cause = errno;
+    if (cause == EEXIST) return cause;
+    const bool targetFailed = cause == EISDIR || (cause == ENOENT && FolderMissing(nativeTo));
+    RaiseCause(cause, targetFailed ? nativeTo : nativeFrom, run_time::kPathAccess);
+  }
+  newFolder.Sync();
+  if (oldFolder.Path() != newFolder.Path()) oldFolder.Sync();
+  return 0;
+}
+
+int RenameUnlessTaken(const char* from, const char* to) {
+  if (renameat2(AT_FDCWD, from, AT_FDCWD, to, RENAME_NOREPLACE) == 0) return 0;
+  if (errno != EINVAL && errno != ENOSYS) return -1;
+  // Network file systems that lack the call have links.
+  return link(from, to) == 0 ? unlink(from) : -1;
+}
 
 // Inside the system as far as the file systems allow. The cause of a failure, 0 when there is none.
 int CopyBytes(int from, int to) {
@@ -460,18 +383,13 @@ void PosixFiles::Delete(const std::string& path) {
 }
 
 void PosixFiles::Rename(const std::string& from, const std::string& to) {
-  const std::string nativeFrom = Checked(from);
-  const std::string nativeTo = Checked(to);
-  // Opened first: an error that came after the renaming could not be answered by doing it again.
-  const FolderOf oldFolder(nativeFrom);
-  const FolderOf newFolder(nativeTo);
-  if (std::rename(nativeFrom.c_str(), nativeTo.c_str()) != 0) {
-    const int cause = errno;
-    const bool targetFailed = cause == EISDIR || (cause == ENOENT && FolderMissing(nativeTo));
-    RaiseCause(cause, targetFailed ? nativeTo : nativeFrom, run_time::kPathAccess);
-  }
-  newFolder.Sync();
-  if (oldFolder.Path() != newFolder.Path()) oldFolder.Sync();
+  const auto replace = [](const char* old, const char* chosen) { return std::rename(old, chosen); };
+  // A folder that holds something.
+  if (RenameBy(replace, from, to) == EEXIST) RaiseCause(EEXIST, to, run_time::kPathAccess);
+}
+
+bool PosixFiles::RenameNew(const std::string& from, const std::string& to) {
+  return RenameBy(RenameUnlessTaken, from, to) != EEXIST;
 }
 
 void PosixFiles::CreateFolder(const std::string& path) {

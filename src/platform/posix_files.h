@@ -25,6 +25,8 @@ class PosixFiles : public Files {
   // Removes the name also while a program holds the file.
   void Delete(const std::string& path) override;
   void Rename(const std::string& from, const std::string& to) override;
+  // As Rename, but never in the place of a file: false, and nothing done, when one has the name `to`.
+  bool RenameNew(const std::string& from, const std::string& to);
   void CreateFolder(const std::string& path) override;
   // By way of the name `to` and ".tmp". The copy isn't brought to the disk at once.
   void Copy(const std::string& from, const std::string& to) override;

@@ -69,6 +69,9 @@ TEST_F(Usage, RefusesWhatCannotRun) {
       {{"data", "load", "maps"}, "maps: is a folder"},
       {{"data", "load", "records.json", "plain.txt"}, "plain.txt: line 1, column 2: "},
       {{"data", "dump", "Product", "Nonsense"}, "Nonsense: no such kind of record"},
+      {{"printers", "file", "label"}, "printer label: no such printer in /"},
+      {{"printers", "--test"}, "--test: the name of a printer is wanted"},
+      {{"printers", "--test", "file", "label"}, "printer label: no such printer in /"},
   };
   for (const Refused& refused : table) {
     SCOPED_TRACE(::testing::PrintToString(refused.arguments));
@@ -117,9 +120,9 @@ TEST_F(Usage, LeavesNothingWhereAWorkspaceCannotBeMade) {
 }
 
 TEST_F(Usage, EveryVerbHasAnExample) {
-  const std::vector<std::vector<std::string>> verbs = {{},       {"new"},          {"demo"},         {"classes"},
-                                                       {"data"}, {"data", "load"}, {"data", "dump"}, {"docs"},
-                                                       {"rows"}, {"process"},      {"delete"},       {"log"}};
+  const std::vector<std::vector<std::string>> verbs = {
+      {},       {"new"},  {"demo"},    {"classes"}, {"data"}, {"data", "load"}, {"data", "dump"},
+      {"docs"}, {"rows"}, {"process"}, {"delete"},  {"log"},  {"printers"}};
   for (std::vector<std::string> verb : verbs) {
     verb.push_back("--help");
     const Ran ran = Run(verb);

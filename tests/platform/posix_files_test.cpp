@@ -371,6 +371,19 @@ TEST_F(PosixFilesTest, CopiesIntoThePlaceOfAnOlderFile) {
   EXPECT_EQ(std::distance(std::filesystem::directory_iterator(folder_), {}), 2);
 }
 
+TEST_F(PosixFilesTest, RenamesAnewButNeverInThePlaceOfAFile) {
+  Put("taken.prn", "theirs");
+  std::filesystem::create_directory(Path("folder.prn"));
+  const std::string draft = Put("draft", "ours");
+  EXPECT_FALSE(files_.RenameNew(draft, Path("taken.prn")));
+  EXPECT_FALSE(files_.RenameNew(draft, Path("folder.prn")));
+  EXPECT_EQ(NumberOf([&] { files_.RenameNew(draft, Path("none/1.prn")); }), 76);
+  EXPECT_TRUE(files_.RenameNew(draft, Path("free.prn")));
+  EXPECT_EQ(Bytes(Path("taken.prn")), "theirs");
+  EXPECT_EQ(Bytes(Path("free.prn")), "ours");
+  EXPECT_FALSE(files_.Exists(draft));
+}
+
 TEST_F(PosixFilesTest, TakesABackslashForASeparatorUnlessAFileBearsThatName) {
   std::filesystem::create_directory(Path("in"));
   std::filesystem::create_directory(Path("od\\d"));

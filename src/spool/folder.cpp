@@ -1,0 +1,125 @@
+#include <fcntl.h>
+#include <sys/file.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <charconv>
+#include <filesystem>
+#include <thread>
+
+#include "platform/posix_calls.h"
+#include "platform/posix_files.h"
+#include "spool/destination.h"
+
+namespace partnerkit::spool {
+
+namespace fs = std::filesystem;
+using platform::Descriptor, platform::RaiseCause, platform::Uninterrupted;
+
+namespace {
+
+constexpr std::string_view kDraftPrefix = ".partnerkit-", kDraftSuffix = ".draft";
+// Far above any number that counting reaches, so that a stray file's name cannot exhaust them.
+constexpr std::size_t kMostDigits = 15;
+
+// A folder that jobs are numbered in, by one program at a time. Where the file system has no locks, that no file is
+// ever replaced has to do.
+class HeldFolder {
+ public:
+  HeldFolder(const std::string& path, std::chrono::milliseconds patience)
+      : path_(path), folder_(Uninterrupted([&] { return open(path.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC); })) {
+    if (!folder_.IsOpen() && errno == ENOENT) {
+      platform::Raise(run_time::kPathNotFound, path, platform::CauseText(ENOENT));
+    }
+    if (!folder_.IsOpen()) RaiseCause(errno, path, run_time::kPathAccess);
+    const auto deadline = std::chrono::steady_clock::now() + patience;
+    while (!(locked_ = Uninterrupted([&] { return flock(folder_.Number(), LOCK_EX | LOCK_NB); }) == 0)) {
+      if (errno != EWOULDBLOCK) return;
+      if (std::chrono::steady_clock::now() > deadline) {
+        platform::Raise(run_time::kPermissionDenied, path,
+                        "Another program has held the folder for " + InSeconds(patience));
+      }
+      std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }
+  }
+
+  // The highest number of a job; 0 when there is none. Takes away drafts that killed programs left.
+  std::uint64_t LastNumber() const {
+    std::uint64_t last = 0;
+    std::error_code failure;
+    for (fs::directory_iterator file(path_, failure), end; !failure && file != end; file.increment(failure)) {
+      const std::string name = file->path().filename().string();
+      last = std::max(last, NumberOf(name));
+      if (locked_ && name.starts_with(kDraftPrefix) && name.ends_with(kDraftSuffix)) unlink(file->path().c_str());
+    }
+    if (failure) RaiseCause(failure.value(), path_, run_time::kPathAccess);
+    return last;
+  }
+
+ private:
+  static std::uint64_t NumberOf(std::string_view name) {
+    if (!name.ends_with(".prn") && !name.ends_with(".pdf")) return 0;
+    name.remove_suffix(4);
+    std::uint64_t number = 0;
+    const auto read = std::from_chars(name.data(), name.data() + name.size(), number);
+    return read.ptr == name.data() + name.size() && name.size() <= kMostDigits ? number : 0;
+  }
+
+  std::string path_;
+  Descriptor folder_;
+  bool locked_ = false;
+};
+
+std::string FileName(std::uint64_t number, Content content) {
+  const std::string digits = std::to_string(number);
+  return std::string(4 - std::min<std::size_t>(4, digits.size()), '0') + digits +
+         (content == Content::kPdf ? ".pdf" : ".prn");
+}
+
+class FolderDestination : public Destination {
+ public:
+  FolderDestination(const std::string& folder, const TimeOuts& timeOuts)
+      : folder_(platform::NativePath(folder)), timeOuts_(timeOuts) {}
+
+  std::string Deliver(std::string_view bytes, Content content, const std::string&) override {
+    const HeldFolder held(folder_, timeOuts_.stall);
+    std::uint64_t number = held.LastNumber();
+    const std::string draft =
+        InFolder(std::string(kDraftPrefix) + std::to_string(getpid()) + std::string(kDraftSuffix));
+    try {
+      const std::unique_ptr<OutputFile> file = files_.OpenOutput(draft, OutputMode::kReplace);
+      file->Write(bytes);
+      file->Sync();
+      file->Close();
+      std::string name;
+      do name = InFolder(FileName(++number, content));
+      while (!files_.RenameNew(draft, name));
+      return name;
+    } catch (...) {
+      unlink(draft.c_str());
+      throw;
+    }
+  }
+
+  void Check() override {
+    const HeldFolder held(folder_, timeOuts_.stall);
+    if (faccessat(AT_FDCWD, folder_.c_str(), W_OK | X_OK, AT_EACCESS) != 0) {
+      RaiseCause(errno, folder_, run_time::kPathAccess);
+    }
+  }
+
+ private:
+  std::string InFolder(const std::string& name) const { return (fs::path(folder_) / name).string(); }
+
+  std::string folder_;
+  TimeOuts timeOuts_;
+  platform::PosixFiles files_;
+};
+
+}  // namespace
+
+std::unique_ptr<Destination> MakeFolder(const std::string& folder, const TimeOuts& timeOuts) {
+  return std::make_unique<FolderDestination>(folder, timeOuts);
+}
+
+}  // namespace partnerkit::spool
