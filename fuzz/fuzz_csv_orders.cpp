@@ -4,6 +4,8 @@
 
 #include "order_run.h"
 
+const std::string_view partnerkit::fuzz::kDefaultClass = "PartnerKit.clsMGB850csv";
+
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   using namespace partnerkit::fuzz;
   const std::string orders(reinterpret_cast<const char*>(data), size);

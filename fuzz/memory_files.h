@@ -18,6 +18,10 @@ class MemoryFiles : public Files {
   void Put(const std::string& path, std::string bytes) { names_[path] = std::make_shared<File>(std::move(bytes)); }
   const std::string& Bytes(const std::string& path) { return Named(path)->bytes; }
   std::size_t Count() const { return names_.size(); }
+  template <class F>
+  bool AllNames(F fits) const {
+    return std::all_of(names_.begin(), names_.end(), [&](const auto& entry) { return fits(entry.first); });
+  }
   bool AnyHeld() const {
     return std::any_of(names_.begin(), names_.end(), [](const auto& entry) { return entry.second->holders != 0; });
   }

@@ -1,5 +1,4 @@
-// An order import under fuzzing: a supplier in memory, whole runs over an order file, and what must hold of them for
-// every input.
+// A CSV order import under fuzzing: whole runs over an order file, and what must hold of them for every input.
 #pragma once
 
 #include <algorithm>
@@ -10,35 +9,20 @@
 #include <string_view>
 #include <vector>
 
-#include "memory_files.h"
-#include "memory_host.h"
+#include "import_run.h"
 #include "order_lines.h"
-#include "partnerkit/catalogue.h"
-#include "partnerkit/platform.h"
-#include "platform/clocks.h"
-#include "subject.h"
 
 namespace partnerkit::fuzz {
 
 inline constexpr const char* kOrders = "inbox/orders.csv";
 inline constexpr const char* kMap = "maps/orders.map";
-inline constexpr const char* kBackup = "backup/po.csv";
 
-class OrderRun {
+class OrderRun : private ImportRun {
  public:
-  // `checks`: products, prices and locations are checked, and a fault leaves its procedure; without, it is passed over.
-  // `answers`: orders are acknowledged.
-  OrderRun(std::string_view map, std::string_view orders, bool checks, bool answers) : lines_(map) {
+  OrderRun(std::string_view map, std::string_view orders, bool checks, bool answers)
+      : ImportRun(kOrders, orders, checks, answers), lines_(map) {
     files_.Put(kMap, std::string(map));
-    files_.Put(kOrders, std::string(orders));
     files_.Put(kBackup, "an order of last week\r\n");
-    ports_ = platform::DefaultPorts();
-    ports_.files = &files_;
-    ports_.clock = &clock_;
-    ports_.errorOutlets.dialog = [checks](const ErrorReport&, const std::string&) {
-      return checks ? Button::kAbort : Button::kIgnore;
-    };
-    Stock(checks, answers);
   }
 
   // A whole run over every row. False when there are no rows.
@@ -47,7 +31,7 @@ class OrderRun {
     const std::string backup = files_.Bytes(kBackup);
     RowTable rows;
     const std::unique_ptr<Translator> importer = Loaded(rows);
-    if (!importer) return false;
+    if (!importer) return CheckTidy(), false;
     Settled settled;
     for (std::size_t row = 0; row < rows.Rows(); ++row) {
       ErrorList log;
@@ -88,9 +72,6 @@ class OrderRun {
   }
 
  private:
-  static constexpr std::int32_t kWarned = static_cast<std::int32_t>(0x80040001);
-  static constexpr std::int32_t kRejected = static_cast<std::int32_t>(0x80040002);
-
   // The keys of the orders dealt with in a run: of those posted, and of all.
   struct Settled {
     std::set<std::string> posted, done;
@@ -101,53 +82,6 @@ class OrderRun {
     bool faulty;
   };
 
-  void Stock(bool checks, bool answers) {
-    for (const auto& [type, record] : TheSubject().records) {
-      if (type == &Vendor::kType) static_cast<Vendor*>(record.get())->POBackupFile = kBackup;
-      Check(host_.Records().Add(*type, record.get()), "the supplier's records are stored");
-    }
-    EDIDoc document = TheSubject().document;
-    document.EDIDocId = 1;
-    document.MapFolder = "maps/";
-    document.MapFile = "orders.map";
-    document.ValidateProduct = document.ValidateCost = document.ValidateRetail = checks;
-    Check(Add(host_.Records(), document), "the document is stored");
-    if (!answers) return;
-    document.EDIDocId = 2;
-    document.DocumentCode = "855";
-    Check(Add(host_.Records(), document), "the acknowledgement is stored");
-  }
-
-  // An importer that has listed the file; nothing when there was nothing to list, and the file is then as it was.
-  std::unique_ptr<Translator> Loaded(RowTable& rows) {
-    const std::string before = files_.Bytes(kOrders);
-    std::unique_ptr<Translator> importer = CreateTranslator(TheSubject().progId, ports_);
-    Check(importer != nullptr, "the class is known");
-    ColumnTable columns;
-    Check(importer->Init(host_, 1, columns), "Init gives True");
-    const std::int32_t count = importer->Load(kOrders, rows);
-    if (count > 0) {
-      Check(rows.Rows() == static_cast<std::size_t>(count), "Load gives the number of rows");
-      return importer;
-    }
-    importer->Cancel();
-    Check(files_.Bytes(kOrders) == before, "a file without rows stays as it was");
-    CheckTidy();
-    return nullptr;
-  }
-
-  std::vector<LogRecord> Told(const ErrorList& list) {
-    std::vector<LogRecord> told;
-    for (const std::int32_t id : list.value_or(std::vector<std::int32_t>())) {
-      told.emplace_back().LogId = id;
-      Check(Load(host_.Records(), told.back()), "the log has what the error list names");
-    }
-    return told;
-  }
-
-  static bool Says(const LogRecord& log, std::int32_t kind, std::string_view words) {
-    return log.ErrorNumber == kind && Str(log.Message).starts_with(words);
-  }
   static bool AnyWarns(const std::vector<LogRecord>& told, std::initializer_list<std::string_view> openings) {
     return std::any_of(told.begin(), told.end(), [&](const LogRecord& log) {
       return std::any_of(openings.begin(), openings.end(),
@@ -194,12 +128,6 @@ class OrderRun {
     if (id > 0 || faulty || (!told.empty() && TurnsAway(told.back()))) settled.done.insert(key);
   }
 
-  std::int32_t IdOf(const std::string& number) {
-    std::int32_t id = 0;
-    host_.Records().ForEach<Order>([&](const Order& order) { id = order.PONo == number ? order.OrderId : id; });
-    return id;
-  }
-
   // All transactions of one number leave together: one that failed goes with another of its number that was dealt with.
   void CheckFile(const std::string& before, const std::string& backup, const Settled& settled) {
     const ClassRules& rules = TheSubject().rules;
@@ -242,10 +170,6 @@ class OrderRun {
     Check(files_.Count() == 3, "no file is left over or lost");
   }
 
-  MemoryFiles files_;
-  MemoryHost host_;
-  platform::FixedClock clock_{*DateTime::FromYmdHms(2006, 3, 8, 10, 15, 0)};
-  Ports ports_;
   OrderLines lines_;
   std::map<std::string, Stored> stored_;  // by number
 };

@@ -1,5 +1,5 @@
-"""Writes the inputs that fuzzing a class begins with: seeds.py CLASS FOLDER. Order files and maps of odd shapes, made
-from the class's sample."""
+"""Writes the inputs that fuzzing begins with: seeds.py FOLDER for the segment reader, seeds.py FOLDER CLASS for a class.
+Order files and maps of odd shapes, made from the samples."""
 
 import csv
 import io
@@ -7,6 +7,7 @@ import pathlib
 import sys
 
 from order_samples import order_class
+from x12_samples import x12_class, x12_classes
 
 # Where an order stands to one of its number: as it is, doubled, changed, cancelled, rejected, a blanket order.
 SEQUELS = [{}, {"POPURPOSECODE": "07"}, {"POPURPOSECODE": "05"}, {"POPURPOSECODE": "01"}, {"POPURPOSECODE": "1"},
@@ -15,6 +16,8 @@ SEQUELS = [{}, {"POPURPOSECODE": "07"}, {"POPURPOSECODE": "05"}, {"POPURPOSECODE
            {"POTYPECODE": "230", "POPURPOSECODE": "1"}, {"POTYPECODE": "BL"}, {"POTYPECODE": "BK"},
            {"STOREZONE": ""}, {"STOREZONE": "CO77"}, {"SHIPTOLOCPARTNERNO": "9999"}, {"PARTNEREDIADDR": "OTHEREDI"},
            {"INCOMINGPRODUCTNO": ""}]
+# Purpose and type, likewise.
+X12_SEQUELS = [("00", "SA"), ("07", "SA"), ("01", "SA"), ("05", "SA"), ("00", "BL"), ("00", "RL"), ("00", "BK")]
 ODD_QUANTITIES = ["1e308", "99999999999", "-5", "", "1,5"]
 
 
@@ -60,13 +63,65 @@ def maps(of_class):
     yield "spare_columns", "\n\nSPARE\n".join(columns)
 
 
+def x12_files(of_class):
+    segments, end = of_class.segments, of_class.end
+
+    def written(changed, ends=end):
+        return "".join(segment + ends for segment in changed)
+
+    def with_each(tag, *others):
+        """The segments of that tag followed by others."""
+        return [each for segment in segments for each in (segment, *(others if segment.startswith(tag) else ()))]
+
+    yield "orders", of_class.text
+    yield "line_feeds", written(segments, end.replace("\r", ""))
+    yield "one_line", written(segments, "~")
+    yield "apostrophes", written(segments, "'\r\n")
+    yield "apostrophes_one_line", written(segments, "'")
+    yield "blank_lines", written(segments, "~\r\n \r\n~\r\n")
+    yield "twice_no_end", (of_class.text + of_class.text).rstrip()
+    yield "cut", of_class.text[:len(of_class.text) * 2 // 3]
+    yield "cut_within_another", written(segments[:8]) + of_class.text
+    yield "no_trailers", written(segment for segment in segments if not segment.startswith(("SE", "GE", "IEA")))
+    yield "no_totals", written(segment for segment in segments if not segment.startswith("CTT"))
+    yield "stores_twice", written(each for segment in segments
+                                  for each in [segment] * (1 + segment.startswith("SDQ")))
+    yield "no_stores", written(segment for segment in segments if not segment.startswith("SDQ"))
+    yield "overlong_element", of_class.text.replace("*92*", "*" + "9" * 33000 + "*", 1)
+    yield "changes", of_class.text.replace("GS*PO", "GS*PC").replace("ST*850", "ST*860")
+    yield "two_groups", written(with_each("GE", *segments[1:-1]))
+    yield "other_group", written(segments[:1]) + of_class.text.split("\n", 1)[1].replace("GS*PO", "GS*IN")
+    yield "others", of_class.text.replace(of_class.document["PartnerEDIAddr"], "OTHEREDI") + of_class.text
+    yield "marked", written(segment + "*FA DONE*" * segment.startswith("GS") for segment in segments)
+    for number, (purpose, kind) in enumerate(X12_SEQUELS):
+        sequel = of_class.text
+        for tag in ("BEG", "BCH"):
+            sequel = sequel.replace(f"{tag}*00*SA", f"{tag}*{purpose}*{kind}")
+        yield f"sequel{number}", of_class.text + sequel.replace("ST*850*0", f"ST*850*{number}")
+
+
+def segment_files(classes):
+    for of_class in classes:
+        for name, text in x12_files(of_class):
+            if name in ("orders", "one_line", "apostrophes", "blank_lines"):
+                yield f"{of_class.name}_{name}", text
+
+
+def write(folder, files):
+    folder.mkdir(parents=True, exist_ok=True)
+    for name, text in files:
+        (folder / name).write_bytes(text if isinstance(text, bytes) else text.encode("latin-1"))
+
+
 def main():
-    of_class = order_class(sys.argv[1])
-    for program, seeds in (("fuzz_csv_orders", order_files), ("fuzz_map_file", maps)):
-        folder = pathlib.Path(sys.argv[2]) / program
-        folder.mkdir(parents=True, exist_ok=True)
-        for name, text in seeds(of_class):
-            (folder / name).write_bytes(text if isinstance(text, bytes) else text.encode("latin-1"))
+    folder = pathlib.Path(sys.argv[1])
+    if len(sys.argv) == 2:
+        write(folder / "fuzz_segments", segment_files(x12_classes()))
+    elif "ansix12" in sys.argv[2]:
+        write(folder / "fuzz_x12_orders", x12_files(x12_class(sys.argv[2])))
+    else:
+        write(folder / "fuzz_csv_orders", order_files(order_class(sys.argv[2])))
+        write(folder / "fuzz_map_file", maps(order_class(sys.argv[2])))
 
 
 main()

@@ -49,6 +49,9 @@ inline constexpr ClassRules kClassRules[] = {
 };
 // clang-format on
 
+// The program's own.
+extern const std::string_view kDefaultClass;
+
 struct Subject {
   std::string progId;
   ClassRules rules;
@@ -85,7 +88,7 @@ inline void TakeRecords(const nlohmann::json& data, Subject& subject) {
 inline Subject ReadSubject() {
   Subject subject;
   const char* const named = std::getenv("PARTNERKIT_FUZZ_CLASS");
-  subject.progId = named == nullptr ? "PartnerKit.clsMGB850csv" : named;
+  subject.progId = named == nullptr ? kDefaultClass : named;
   const auto rules = std::ranges::find(kClassRules, subject.progId, &ClassRules::name);
   if (rules != std::end(kClassRules)) subject.rules = *rules;
   for (const cli::DemoFile& file : cli::DemoFiles()) {
@@ -95,6 +98,7 @@ inline Subject ReadSubject() {
   }
   Check(!subject.records.empty(), "there is a sample of the class");
   const std::string mapFile(Str(subject.document.MapFile));
+  if (mapFile.empty()) return subject;
   const std::string name = mapFile.substr(0, mapFile.find('.'));
   subject.map = Sample("maps/" + mapFile);
   subject.orders = Sample("inbox/" + name + ".csv");

@@ -10,41 +10,47 @@ namespace partnerkit::orders {
 
 namespace {
 
-// A file that gets a whole acknowledgement or none. One that then holds nothing goes: a mailbox would send it.
+// A file that gets a whole acknowledgement or none, even from a program that dies over it: what it will hold is written
+// beside it and takes its place. One that then holds nothing goes: a mailbox would send it.
 class AckFile {
  public:
   AckFile(Files& files, std::string path)
       : files_(files),
         path_(std::move(path)),
-        file_(files.OpenOutput(path_, OutputMode::kAppend)),
-        before_(file_->Length()) {}
+        held_(files.OpenOutput(path_, OutputMode::kAppend)),
+        holdsOthers_(held_->Length() > 0) {}
   ~AckFile() {
-    if (whole_ || before_ > 0) return;
-    try {
-      files_.Delete(path_);
-    } catch (const RunTimeError&) {
-      // It stays, empty; a later acknowledgement of that name goes into it.
-    }
+    if (whole_) return;
+    Discard(draft_);
+    if (!holdsOthers_) Discard(path_);
   }
   AckFile(const AckFile&) = delete;
   AckFile& operator=(const AckFile&) = delete;
 
   void Write(std::string_view text) {
-    try {
-      file_->Write(text);
-      file_->Sync();
-    } catch (const RunTimeError&) {
-      file_->Truncate(before_);
-      throw;
-    }
+    if (holdsOthers_) files_.Copy(path_, draft_);
+    const auto draft = files_.OpenOutput(draft_, holdsOthers_ ? OutputMode::kAppend : OutputMode::kReplace);
+    draft->Write(text);
+    draft->Sync();
+    draft->Close();
+    files_.Rename(draft_, path_);
     whole_ = true;
   }
 
  private:
+  void Discard(const std::string& path) {
+    try {
+      files_.Delete(path);
+    } catch (const RunTimeError&) {
+      // It stays; a later acknowledgement of that name takes its place.
+    }
+  }
+
   Files& files_;
   std::string path_;
-  std::unique_ptr<OutputFile> file_;
-  std::uint64_t before_;
+  std::string draft_ = path_ + ".tmp";
+  std::unique_ptr<OutputFile> held_;
+  bool holdsOthers_;
   bool whole_ = false;
 };
 

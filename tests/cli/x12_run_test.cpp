@@ -82,6 +82,20 @@ TEST_F(RunX12, AcknowledgesAGroupOnceThoughItIsListedAgain) {
   EXPECT_FALSE(folder.Has("outbox/FA_PO_771_0603081205.TXT"));
 }
 
+// Of two transactions, one that has no beginning before another set's comes, and one that ends before it begins.
+TEST_F(RunX12, PostsNoOrderThatHasNoBeginningOfItsOwn) {
+  const std::string sample = Sample("orders.x12", "kmart850x12");
+  const std::string broken = sample.substr(0, sample.find("ST*")) +
+                             "ST*850*0001~REF*IA*901177~ST*855*0002~BEG*00*SA*K5**060306~CTT*0~SE*5*0002~"
+                             "ST*850*0003~CTT*0~BEG*00*SA*K6**060306~SE*4*0003~GE*2*771~IEA*1*000000770~";
+  folder.Write("inbox/kmart.x12", broken);
+  const json done = Json({"process", "14", "inbox/kmart.x12"}, 1);
+  EXPECT_EQ(done["rows"], json::parse(R"([["K6", "2006-03-06", "000000770/771/0003", ""]])"));
+  EXPECT_EQ(done["log"].size(), 1U);
+  EXPECT_EQ(done["log"][0]["Message"], "PO K6 import incomplete.");
+  EXPECT_EQ(Orders().size(), 0U);
+}
+
 TEST_F(RunX12, ListsNothingThatItCannotAcknowledge) {
   std::filesystem::remove(folder / "outbox");
   const Ran ran = Run({"--json", "process", "14", "inbox/kmart.x12"});

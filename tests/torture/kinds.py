@@ -7,10 +7,12 @@ POSTED = "posted"        # in the store once, its lines in the backup
 FAULTY = "faulty"        # the same, but stored at Status 9, its faults to be settled there
 KEPT = "kept"            # in the file, byte for byte
 DROPPED = "dropped"      # turned away for good: in neither
+CARRIED_OUT = "carried out"  # in the file or not: the next run finds nothing left to do for it
 
 # An older order of the number in the store.
 ORDER = "order"
 PACKED = "packed"        # one with a packing job
+CHANGEABLE = "changeable"  # the same, whose dates may still be changed
 BLANKET = "blanket"
 HALF = "half"            # this very order, as a program leaves it that dies under a store without transactions
 OTHER_HALF = "other half"

@@ -5,6 +5,7 @@ import random
 from dataclasses import dataclass, field
 
 import kinds
+import verdict
 from kinds import FAULTY, KEPT, POSTED
 from order_samples import WAREHOUSE
 
@@ -27,6 +28,10 @@ class Order:
     @property
     def fate(self):
         return self.kind.fate
+
+    def segments(self):
+        """What of it is found in the file, however its lines end."""
+        return [text.rstrip(b"\r\n") for text in self.texts]
 
     def is_stored(self):
         return self.fate in (POSTED, FAULTY)
@@ -53,24 +58,50 @@ class OrderFile:
                     yield BLANK, not self.trade.drops_blank_lines
                 yield text, order.fate == KEPT or order.number in besides
 
+    @staticmethod
+    def commits_of_listing():
+        return 0
+
+    def followed_by(self, other):
+        """The same file with the other behind it."""
+        self.orders[-1].texts[-1] = verdict.whole(self.orders[-1].texts[-1])
+        return OrderFile(self.trade, self.orders + other.orders)
+
     def posted(self):
         return [order for order in self.orders if order.is_stored()]
 
     def owners(self):
         """The order of each line, as the backup holds it."""
-        return {whole(text): order for order in self.orders for text in order.texts}
+        return {verdict.whole(text): order for order in self.orders for text in order.texts}
 
-
-def whole(text):
-    return text if text.endswith(b"\n") else text + b"\r\n"
+    def expected_store(self):
+        """Status, lines, locations and location lines of every order that has to be in the store, by number."""
+        store = {}
+        for order in self.orders:
+            if order.is_stored():
+                lines = summed(((product, cost), quantity) for product, _, _, quantity, _, cost in order.lines)
+                parts = summed(((place, product), quantity, allocated)
+                               for product, place, _, quantity, allocated, _ in order.lines)
+                store[order.number] = (
+                    9 if order.fate == FAULTY else 0,
+                    sorted((product, quantity, cost) for (product, cost), (quantity,) in lines.items()),
+                    sorted({(place, ship_to) for _, place, ship_to, *_ in order.lines}),
+                    sorted((*key, *quantities) for key, quantities in parts.items()))
+            elif order.kind.outlives:
+                store[order.number] = (0, [(PRODUCTS[-1], 7.0, 1.5)], [(STORES[-1], "")],
+                                       [(STORES[-1], PRODUCTS[-1], 7.0, 7.0)])
+        return store
 
 
 class Trade:
     """One class, and the supplier who gets its orders."""
 
-    def __init__(self, order_class):
+    verdict = verdict
+    backs_up = True
+
+    def __init__(self, order_class, its_kinds=None):
         self.order_class = order_class
-        self.kinds = kinds.KINDS[order_class.name]
+        self.kinds = its_kinds or kinds.KINDS[order_class.name]
         self.cycle = 2 * len(self.kinds) + 1
         self.drops_blank_lines = order_class.name == "clsKMart850csv"
         # So an order that a killed run has posted stays in the file: the next run turns it away as stored already.
@@ -148,7 +179,9 @@ class Trade:
                               "TransactionCtl": controls[2], "Status": 9 if half else 0,
                               "TypeCode": "BL" if older == kinds.BLANKET else "SA"})
         data["OrderLine"].append({"LineId": key, "OrderId": key, "ProductNo": PRODUCTS[-1], "Quantity": 7, "Cost": 1.5})
-        if older == kinds.PACKED:
+        if older == kinds.CHANGEABLE:
+            data["Order"][-1]["ChangeFlag"] = "1"
+        if older in (kinds.PACKED, kinds.CHANGEABLE):
             data["Job"].append({"JobId": key, "OrderId": key})
         if half:
             return
@@ -163,22 +196,3 @@ def summed(entries):
     for key, *quantities in entries:
         sums[key] = [sum(pair) for pair in zip(sums.get(key, [0.0] * len(quantities)), quantities)]
     return sums
-
-
-def expected_store(file):
-    """Status, lines, locations and location lines of every order that has to be in the store, by number."""
-    store = {}
-    for order in file.orders:
-        if order.is_stored():
-            lines = summed(((product, cost), quantity) for product, _, _, quantity, _, cost in order.lines)
-            parts = summed(((place, product), quantity, allocated)
-                           for product, place, _, quantity, allocated, _ in order.lines)
-            store[order.number] = (
-                9 if order.fate == FAULTY else 0,
-                sorted((product, quantity, cost) for (product, cost), (quantity,) in lines.items()),
-                sorted({(place, ship_to) for _, place, ship_to, *_ in order.lines}),
-                sorted((*key, *quantities) for key, quantities in parts.items()))
-        elif order.kind.outlives:
-            store[order.number] = (0, [(PRODUCTS[-1], 7.0, 1.5)], [(STORES[-1], "")],
-                                   [(STORES[-1], PRODUCTS[-1], 7.0, 7.0)])
-    return store

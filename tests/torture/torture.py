@@ -32,11 +32,12 @@ from dataclasses import dataclass
 import failures
 import order_samples
 import orders
-import verdict
+import x12_orders
+import x12_samples
 from workspace import HarnessError, Program, Scenario, trace_of
 
 # The order file's own operations, told from the store's by the name of the file: what settling and its recovery do.
-SETTLING = ("po.csv", "orders.csv", "orders.tmp", "inbox", "backup")
+SETTLING = ("po.csv", "orders.edi", "orders.tmp", "FA_PO_", "inbox", "backup", "outbox")
 
 # Behind a write, a truncation or a sync the disk is as it is before the next operation.
 EVERY = {"rename": ("kill-before", "kill-after"), "unlink": ("kill-before", "kill-after"),
@@ -50,6 +51,9 @@ FAULTS = {"write": ((errno.EIO, "fail-once"), (errno.ENOSPC, "fail-on")), "sync"
 TOLD = 3
 # Kills leave the page cache be, so a memory disk tests as much as a real one, sooner.
 MEMORY_DISK = "/dev/shm"
+
+
+TRADES = {order_samples.OrderClass: orders.Trade, x12_samples.X12Class: x12_orders.X12Trade}
 
 
 class Round:
@@ -77,6 +81,7 @@ FULL = Extent(300, None, None, None, None)
 SAMPLE = Extent(40, 40, 250, 250, 120)
 SHORT = Extent(25, 0, 50, 50, 30)
 GLANCE = Extent(0, 0, 25, 25, 15, failures=False)
+X12_GLANCE = Extent(0, 0, 16, 12, 8, failures=False)
 
 # large: what a partner sends on a busy day. small: every kind of order, few enough to strike at each operation.
 # emptied: all orders post, and the file goes when it is empty.
@@ -94,7 +99,8 @@ class Torture:
         self.options = options
         self.root = root
         self.name = order_class.name
-        self.trade = orders.Trade(order_class)
+        self.trade = TRADES[type(order_class)](order_class)
+        self.verdict = self.trade.verdict
         self.kept_under = pathlib.Path(os.environ["PARTNERKIT_BUILD"]) / "torture"
         self.program = Program(os.environ["PARTNERKIT_PROGRAM"], os.environ["PARTNERKIT_BUILD"])
         self.rng = random.Random(options.seed)
@@ -114,21 +120,20 @@ class Torture:
 
     def strike(self, folder, strike):
         if strike.startswith("at:"):
-            return self.program.process_until(folder, float(strike[3:]))
+            return self.program.process(folder, until=float(strike[3:]))
         return self.program.process(folder, strike=strike.replace(":", " "))
 
     def run(self, a_round, keep=False):
         """Gives whether the last strike killed."""
         folder = a_round.scenario.copy(self.root)
         found = []
-        killed = False
+        struck = []
         for strike in a_round.strikes:
-            ended = self.strike(folder, strike)
-            killed = ended.status == -signal.SIGKILL
-            found += verdict.struck_violations(ended, killed)
+            struck.append(self.strike(folder, strike))
+            found += self.verdict.struck_violations(a_round.scenario, folder, struck)
+        killed = struck[-1].status == -signal.SIGKILL
         last = self.program.process(folder)
-        found += verdict.violations(a_round.scenario, folder, self.program, last,
-                                    settled_once=len(a_round.strikes) < 2)
+        found += self.verdict.violations(a_round.scenario, folder, self.program, last, earlier=struck)
         self.close(f"repeat {a_round.text()}", folder, found, keep)
         with self.lock:
             fails = any(strike.startswith("fail") for strike in a_round.strikes)
@@ -180,7 +185,7 @@ class Torture:
         began = time.monotonic()
         last = self.program.process(folder)
         took = time.monotonic() - began
-        self.close(f"repeat {scenario.name} at:1000", folder, verdict.violations(scenario, folder, self.program, last))
+        self.close(f"repeat {scenario.name} at:1000", folder, self.verdict.violations(scenario, folder, self.program, last))
         return took
 
     def kill_about(self, moment):
@@ -286,18 +291,23 @@ def default_folder():
     return MEMORY_DISK if roomy else tempfile.gettempdir()
 
 
+def without_library(name):
+    return name.rpartition(".")[2]
+
+
 def main():
     parser = argparse.ArgumentParser(description=__doc__, formatter_class=argparse.RawDescriptionHelpFormatter)
     parser.add_argument("form", nargs="?", default="long", choices=("long", "short", "failures", "repeat"))
     parser.add_argument("what", nargs="*", help="for repeat: SCENARIO STRIKE...; for failures: names")
-    parser.add_argument("--class", dest="named", type=order_samples.order_class,
+    every_class = [*order_samples.order_classes(), *x12_samples.x12_classes()]
+    parser.add_argument("--class", dest="named", metavar="CLASS", type=without_library, choices=[each.name for each in every_class],
                         help="the class; for repeat and failures the model class if none is named")
     parser.add_argument("--seed", type=int, default=1, help="of the random moments and samples, %(default)s")
     parser.add_argument("--kills", type=int, help="how many random kills")
     parser.add_argument("--jobs", type=int, default=os.cpu_count(), help="rounds at once")
     parser.add_argument("--folder", default=default_folder(), help="where the workspaces lie meanwhile, %(default)s")
     options = parser.parse_args()
-    classes = [options.named] if options.named else order_samples.order_classes()
+    classes = [each for each in every_class if options.named in (None, each.name)]
     if options.form in ("repeat", "failures"):
         del classes[1:]
     found = 0
@@ -314,7 +324,8 @@ def main():
             elif options.form == "long":
                 torture.all_sorts(FULL if model else SAMPLE, slow=model)
             else:
-                torture.all_sorts(SHORT if model else GLANCE, slow=False)
+                glance = GLANCE if torture.trade.backs_up else X12_GLANCE
+                torture.all_sorts(SHORT if model else glance, slow=False)
         except HarnessError as error:
             print(f"torture: {order_class.name}: {error}", file=sys.stderr)
             return 2

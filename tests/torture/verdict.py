@@ -1,29 +1,35 @@
 """What has to hold once a plain run has followed the run that was struck."""
 
 import json
+import signal
 import sqlite3
 
-import orders
 from kinds import KEPT
 from workspace import BACKUP, EARLIER_BACKUP, ORDER_FILE
 
 DATABASE = "partnerkit.db"
 
 
-def violations(scenario, folder, program, last, *, settled_once=True, backup=True):
-    """`last` is the plain run; `settled_once`: at most one run before it came as far as the backup."""
-    found = []
+def violations(scenario, folder, program, last, *, earlier=()):
+    """`last` is the plain run, `earlier` are the runs before it."""
+    found = run_violations(last)
     if last.status not in (0, 1):
-        return [f"the plain run ends with status {last.status}: {last.err.strip()}"]
-    if last.err.strip() and "nothing to list" not in last.err:
-        found.append(f"the plain run says {last.err.strip()}")
-    found += store_violations(folder, orders.expected_store(scenario.file))
+        return found
+    # At most one run before it came as far as the backup.
+    settled_once = len(earlier) < 2
+    found += store_violations(folder, scenario.file.expected_store())
     found += file_violations(scenario, folder, last.posted(), settled_once)
-    if backup:
-        found += backup_violations(scenario, folder, last.posted(), settled_once)
+    found += written_violations(scenario, folder, [*earlier, last])
     found += leftovers(scenario, folder)
     found += log_violations(folder, program)
     return found
+
+
+def run_violations(last, foreseen=("nothing to list",)):
+    if last.status not in (0, 1):
+        return [f"the plain run ends with status {last.status}: {last.err.strip()}"]
+    said = [line for line in last.err.splitlines() if line.strip() and not any(words in line for words in foreseen)]
+    return [f"the plain run says {said}"] if said else []
 
 
 def store_violations(folder, expected):
@@ -96,39 +102,61 @@ def file_violations(scenario, folder, posted_last, settled_once):
             f" lost {lost[:5]}, still there {left[:5]}"]
 
 
+def whole(text):
+    return text if text.endswith(b"\n") else text + b"\r\n"
+
+
+def left_violations(file, path, _last, _runs):
+    return [] if read(path) == file.kept() else [f"{path.name} is not what should be left of it"]
+
+
+def together_violations(_scenario, _folder):
+    """Of the files that several programs write to."""
+    return []
+
+
+def written_violations(scenario, folder, runs):
+    """What has to hold of the files beside the order file; the last of the runs was a plain one."""
+    return backup_violations(scenario, folder, runs[-1].posted(), len(runs) < 3) if scenario.backup else []
+
+
 def backup_violations(scenario, folder, posted_last, settled_once):
     content = read(folder / BACKUP)
     if not content.startswith(EARLIER_BACKUP):
         return ["the backup has lost what it held before"]
     texts = content[len(EARLIER_BACKUP):].splitlines(True)
     owners = scenario.file.owners()
-    if any(text not in owners or orders.whole(text) != text for text in texts):
+    if any(text not in owners or whole(text) != text for text in texts):
         return ["the backup holds a broken or foreign line"]
     if len(set(texts)) != len(texts):
         return ["the backup holds a line twice"]
     strays = {owners[text].number for text in texts if not owners[text].is_stored()}
     if strays:
         return [f"the backup holds orders that were never posted: {sorted(strays)[:5]}"]
-    of_last = [orders.whole(text) for order in scenario.file.posted() if order.number in posted_last
+    of_last = [whole(text) for order in scenario.file.posted() if order.number in posted_last
                for text in order.texts]
     earlier = texts[:len(texts) - len(of_last)]
     if texts[len(earlier):] != of_last:
         return ["the backup's end is not what the plain run posted"]
-    of_struck = [orders.whole(text) for order in scenario.file.posted() if order.number not in posted_last
+    of_struck = [whole(text) for order in scenario.file.posted() if order.number not in posted_last
                  for text in order.texts]
     if settled_once and earlier not in ([], of_struck):
         return ["the backup holds some, not all or none, of the lines that the struck run posted"]
     present = set(earlier)
     halves = {owners[text].number for text in earlier
-              if not present.issuperset(map(orders.whole, owners[text].texts))}
+              if not present.issuperset(map(whole, owners[text].texts))}
     return [f"the backup holds parts of orders: {sorted(halves)[:5]}"] if halves else []
 
 
-def leftovers(scenario, folder):
+def new_files(scenario, folder):
     def names(top):
         return {str(path.relative_to(top)) for path in top.rglob("*") if path.is_file()}
 
-    strange = names(folder) - names(scenario.prepared)
+    return names(folder) - names(scenario.prepared)
+
+
+def leftovers(scenario, folder):
+    strange = new_files(scenario, folder)
     if scenario.file.trade.keeps_turned_away:
         strange.discard("inbox/orders.tmp")  # with nothing to settle, the next rewrite replaces it
     return [f"left over: {sorted(strange)}"] if strange else []
@@ -145,10 +173,9 @@ def log_violations(folder, program):
     return [] if len(set(completed)) == len(completed) else ["the log has an order completed twice"]
 
 
-def struck_violations(ended, killed):
-    """What has to hold of the struck run itself."""
-    if killed:
-        return []
-    if ended.status not in (0, 1, 2):
+def struck_violations(_scenario, _folder, struck):
+    """What has to hold of the last of these runs, which was struck."""
+    ended = struck[-1]
+    if ended.status not in (0, 1, 2, -signal.SIGKILL):
         return [f"the struck run ends with status {ended.status}: {ended.err.strip()[-500:]}"]
     return []

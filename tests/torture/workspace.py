@@ -14,7 +14,7 @@ import time
 HERE = pathlib.Path(__file__).parent
 TIME_LIMIT = 300  # seconds; a run that takes longer hangs
 NOW = "2006-03-08T10:15:00"
-ORDER_FILE = "inbox/orders.csv"
+ORDER_FILE = "inbox/orders.edi"
 BACKUP = "backup/po.csv"
 EARLIER_BACKUP = b"an order of last week,1\r\nan order of last week,2\r\n"
 
@@ -25,6 +25,8 @@ class HarnessError(Exception):
 
 class Ended:
     """What a run left: its status, below 0 when a signal ended it, and what it said."""
+
+    order_file = None  # as the run found it
 
     def __init__(self, status, out, err):
         self.status = status
@@ -90,16 +92,17 @@ class Program:
     def run(self, folder, *arguments, **how):
         return self.finish(self.start(folder, *arguments, **how))
 
-    def process(self, folder, **how):
-        return self.run(folder, "process", "1", ORDER_FILE, **how)
-
-    def process_until(self, folder, seconds):
-        """Kills the run that many seconds after its start, unless it has ended by then."""
-        process = self.start(folder, "process", "1", ORDER_FILE)
-        timer = threading.Timer(seconds, process.kill)
-        timer.start()
+    def process(self, folder, *, until=None, **how):
+        """`until`: the run is killed so many seconds after its start, unless it has ended by then."""
+        path = pathlib.Path(folder) / ORDER_FILE
+        order_file = path.read_bytes() if path.is_file() else None
+        process = self.start(folder, "process", "1", ORDER_FILE, **how)
+        timer = threading.Timer(until or 0, process.kill)
+        if until is not None:
+            timer.start()
         ended = self.finish(process)
         timer.cancel()
+        ended.order_file = order_file
         return ended
 
     def process_stopped(self, folder, strike, document="1", name=ORDER_FILE):
@@ -127,12 +130,13 @@ class Scenario:
     def __init__(self, program, root, name, file, **how):
         self.name = name
         self.file = file
+        self.backup = how.get("backup", BACKUP)
         self.prepared = pathlib.Path(root) / f"prepared-{name}"
         must(program.run(root, "new", str(self.prepared)))
         (self.prepared / "records.json").write_text(file.trade.records(file, **how))
         must(program.run(self.prepared, "data", "load", "records.json"))
         (self.prepared / "records.json").unlink()
-        (self.prepared / "maps" / "orders.map").write_text("\n".join(file.trade.order_class.columns) + "\n")
+        (self.prepared / "maps" / "orders.map").write_text("\n".join(file.trade.order_class.columns))
         (self.prepared / ORDER_FILE).write_bytes(file.content())
         (self.prepared / BACKUP).write_bytes(EARLIER_BACKUP)
 

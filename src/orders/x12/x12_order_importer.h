@@ -5,6 +5,7 @@
 // it as acknowledged. The engine tells it in full; a partner's class gives its values and reads what only it is sent.
 #pragma once
 
+#include <cstdint>
 #include <memory>
 #include <optional>
 #include <string>

@@ -49,7 +49,7 @@ X12OrderImporter::Next X12OrderImporter::ReadTransaction(Posting& posting) {
       if (posting.begun) break;
       next = TakeBeginning(posting);
     } else if (tag == "CTT") {
-      posting.complete = true;
+      posting.complete = posting.begun;
       return Distribute(posting);
     } else if (EndsTransaction(tag)) {
       break;

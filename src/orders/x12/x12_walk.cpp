@@ -51,6 +51,8 @@ X12Walk::Event X12Walk::TakeInOrders(const X12Segment& segment) {
     awaitsBeginning_ = true;
     return Event::kTransactionBegins;
   }
+  // A beginning behind it is no part of the transaction before it.
+  if (segment.Begins("ST*")) awaitsBeginning_ = false;
   if (!awaitsBeginning_ || !IsOneOf(segment.Text().substr(0, 3), values_.beginnings)) return Event::kNone;
   awaitsBeginning_ = false;
   return Event::kOrderBegins;
