@@ -66,7 +66,11 @@ class X12Segments {
         (text[0] == 'I' ? interchange : group) = Element(text, text[0] == 'I' ? 13 : 6);
         open = nullptr;
       } else if (text.starts_with("ST")) {
-        const std::string key = interchange + "/" + group + "/" + (text.size() > 7 ? text.substr(7) : "");
+        const std::string key = std::string(interchange)
+                                    .append("/")
+                                    .append(group)
+                                    .append("/")
+                                    .append(text.size() > 7 ? std::string_view(text).substr(7) : std::string_view());
         ++count[key];
         open = &transactions[key];
       } else if (text.starts_with("SE*") || text.starts_with("GE") || text.starts_with("IEA")) {
