@@ -81,6 +81,15 @@ class Bench:
         self.memory = max(getattr(self, "memory", 0), memory)
         return busy if self.cpu else elapsed
 
+    def rows_and_copy(self):
+        """Lists the file, and copies it to the disk proper, as Term must with every line before the old file may go."""
+        copy = self.folder / "copy"
+        copy.unlink(missing_ok=True)
+        os.sync()
+        _, elapsed, busy, _ = run("dd", f"if={self.large}", f"of={copy}", "bs=1M", "conv=fsync", "status=none")
+        copy.unlink()
+        return self.rows() + (busy if self.cpu else elapsed)
+
     def tokenise(self):
         _, elapsed, busy, _ = run(BENCH / "tokenise", self.large)
         return busy if self.cpu else elapsed
@@ -143,5 +152,5 @@ class Bench:
         self.print_line("  its memory : 60 MB", f"{self.memory / 1e6:.1f} MB", "60.0 MB", 1.0, self.memory / 60e6)
         self.compare(f"process of {few} orders : bare inserts", self.process_few, self.bare_insert, 2.0)
         self.compare(f"an order of {many} : of {few}", self.process_many, self.process_few_each, 1.15, "us")
-        self.compare("Term, every order to the backup : rows", lambda: self.settle("all"), self.rows, 1.5)
-        self.compare("Term, every order but one kept : rows", lambda: self.settle("one"), self.rows, 1.5)
+        self.compare("Term, all to the backup : rows and copy", lambda: self.settle("all"), self.rows_and_copy, 1.5)
+        self.compare("Term, all but one kept : rows and copy", lambda: self.settle("one"), self.rows_and_copy, 1.5)
