@@ -15,6 +15,7 @@ import sys
 import tempfile
 
 import order_samples
+from barcodes import BarcodeBench
 from x12 import X12Bench
 from yardsticks import BUILD, Bench, Failure
 
@@ -24,10 +25,14 @@ LARGE_FILE_COPIES = 5
 BYTES_PER_ORDER = 60_000
 
 MODEL, SLOWEST = "clsMGB850csv", "clsColesEIDCPOcsv"
+OTHERS = {"x12": X12Bench, "barcode": BarcodeBench}
 
-FULL = {"runs": 3, "bytes": 150_000_000, "orders": 2_000, "many": 20_000, "segments": 10_000_000}
-SURVEY = {"runs": 3, "bytes": 15_000_000, "orders": 500, "many": 1_500, "segments": 1_000_000}
-QUICK = {"runs": 1, "bytes": 3_000_000, "orders": 60, "many": 200, "segments": 100_000}
+FULL = {"runs": 3, "bytes": 150_000_000, "orders": 2_000, "many": 20_000, "segments": 10_000_000,
+        "barcodes": 1_000_000}
+SURVEY = {"runs": 3, "bytes": 15_000_000, "orders": 500, "many": 1_500, "segments": 1_000_000,
+          "barcodes": 100_000}
+QUICK = {"runs": 1, "bytes": 3_000_000, "orders": 60, "many": 200, "segments": 100_000,
+         "barcodes": 10_000}
 
 
 def check_space(sizes):
@@ -41,16 +46,16 @@ def main():
     parser = argparse.ArgumentParser(prog="./pk bench", description=__doc__,
                                      formatter_class=argparse.RawDescriptionHelpFormatter)
     parser.add_argument("--quick", action="store_true", help="small sizes, once each: shows that it runs, not how fast")
-    parser.add_argument("--class", dest="named", help="one CSV class instead, or all, these at a smaller size, or x12")
+    parser.add_argument("--class", dest="named", help="one CSV class instead, or all, these at a smaller size, or x12,"
+                        " or barcode")
     parser.add_argument("--cpu", action="store_true", help="compare processor time")
     parser.add_argument("--runs", type=int, help="how often each side runs (%d)" % FULL["runs"])
     options = parser.parse_args()
     sizes = dict(QUICK if options.quick else SURVEY if options.named == "all" else FULL)
-    csv_classes = [] if options.named == "x12" else order_samples.order_classes() if options.named == "all" else \
+    csv_classes = [] if options.named in OTHERS else order_samples.order_classes() if options.named == "all" else \
         [order_samples.order_class(name) for name in ([options.named] if options.named else [MODEL, SLOWEST])]
     kinds = [(Bench, of_class) for of_class in csv_classes]
-    if options.named in (None, "x12"):
-        kinds.append((X12Bench, None))
+    kinds += [(kind, None) for name, kind in OTHERS.items() if options.named in (None, name)]
     if options.runs:
         sizes["runs"] = options.runs
     signal.signal(signal.SIGTERM, lambda *_: sys.exit(2))  # so that the files go

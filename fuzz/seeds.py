@@ -1,5 +1,5 @@
-"""Writes the inputs that fuzzing begins with: seeds.py FOLDER for the segment reader, seeds.py FOLDER CLASS for a class.
-Order files and maps of odd shapes, made from the samples."""
+"""Writes the inputs that fuzzing begins with: seeds.py FOLDER for the programs that read no class, seeds.py FOLDER CLASS
+for a class. Order files and maps of odd shapes, made from the samples, and the data of barcodes."""
 
 import csv
 import io
@@ -18,6 +18,8 @@ SEQUELS = [{}, {"POPURPOSECODE": "07"}, {"POPURPOSECODE": "05"}, {"POPURPOSECODE
            {"INCOMINGPRODUCTNO": ""}]
 # Purpose and type, likewise.
 X12_SEQUELS = [("00", "SA"), ("07", "SA"), ("01", "SA"), ("05", "SA"), ("00", "BL"), ("00", "RL"), ("00", "BK")]
+BARCODES = ["", "1234", "~20100393123450000012344", "\x1d4210363000\x1d901234", "~20110A-1~20121b", "12345-\x02", "1e10",
+            "A1 B2", "-1.5\x01", "9312345678907", "0012345678905", "212222", "FNC1", "CODEA", "\x1c\x1e\x7f\xe9~20"]
 ODD_QUANTITIES = ["1e308", "99999999999", "-5", "", "1,5"]
 
 
@@ -117,6 +119,7 @@ def main():
     folder = pathlib.Path(sys.argv[1])
     if len(sys.argv) == 2:
         write(folder / "fuzz_segments", segment_files(x12_classes()))
+        write(folder / "fuzz_bar_pattern", ((str(number), data) for number, data in enumerate(BARCODES)))
     elif "ansix12" in sys.argv[2]:
         write(folder / "fuzz_x12_orders", x12_files(x12_class(sys.argv[2])))
     else:
