@@ -5,10 +5,9 @@
 #include <string>
 #include <string_view>
 
-namespace partnerkit::cli {
+#include "frame/windows_1252.h"
 
-// The text as UTF-8: bytes that aren't are read as Windows-1252, which is what partners' older programs write.
-std::string Utf8(std::string_view bytes);
+namespace partnerkit::cli {
 
 // The text as UTF-8 on one line that a terminal may be sent: each run of blanks and line ends is one blank, any other
 // control character a "?".

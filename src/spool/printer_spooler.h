@@ -3,10 +3,12 @@
 
 #include <filesystem>
 #include <functional>
+#include <map>
 #include <memory>
 #include <string>
 #include <vector>
 
+#include "frame/byte_sink.h"
 #include "partnerkit/records.h"
 #include "partnerkit/spooling.h"
 #include "spool/destination.h"
@@ -18,7 +20,6 @@ inline constexpr std::string_view kFilePrinter = "file";
 inline constexpr std::string_view kSpoolFolder = "spool";
 
 // Makes a device that gives its document to `pdf`, the last of it at EndDoc; `title` is the document's.
-using ByteSink = std::function<void(std::string_view bytes)>;
 using PdfDeviceFactory = std::function<std::unique_ptr<DrawingDevice>(ByteSink pdf, const std::string& title)>;
 
 class PrinterSpooler : public Spooler {
@@ -35,6 +36,9 @@ class PrinterSpooler : public Spooler {
   // 0 for folders and sockets, which hold no queue.
   std::int32_t JobCount(const std::string& printer) override;
 
+  // Sends text to a port, past all printers; it counts as a job.
+  void SendToPort(const std::string& port, std::string_view bytes);
+
   // Raises the reason why the printer would not take a job now.
   void Check(const std::string& printer);
 
@@ -47,13 +51,15 @@ class PrinterSpooler : public Spooler {
   class Job;
 
   std::unique_ptr<RawJob> OpenJob(const std::string& printer, const std::string& document, Content content);
-  std::unique_ptr<Destination> DestinationOf(const std::string& printer) const;
+  std::shared_ptr<Destination> DestinationOf(const std::string& printer);
+  std::unique_ptr<Destination> MakeDestination(const std::string& printer) const;
   void AddJob(const std::string& name);
 
   std::vector<Printer> printers_;
   std::filesystem::path workspace_;
   PdfDeviceFactory makePdfDevice_;
   TimeOuts timeOuts_;
+  std::map<std::string, std::shared_ptr<Destination>> destinations_;  // by printer
   std::vector<std::string> jobs_;
 };
 

@@ -1,0 +1,62 @@
+#include "cairo/drawn.h"
+#include "partnerkit/platform.h"
+#include "render/drawing.h"
+
+namespace partnerkit::cairo {
+namespace {
+
+// What a scanner reads, a symbol a line, without the names of their kinds.
+std::string Scanned(const std::string& picture) {
+  return testing::Told(picture, "zbarimg --nodbus --quiet --raw \"$document\" 2>/dev/null");
+}
+
+TEST(CairoBarcodeTest, ScannersReadWhatWasDrawn) {
+  const struct {
+    std::string_view data;
+    const char* read;  // FNC1 is silent at the front of a symbol, and a group separator behind it
+  } cases[] = {
+      {"~20100393123450000000017", "00393123450000000017\n"},
+      {"~201421036"
+       "3000"
+       "~20190"
+       "0123",
+       "4210363000\x1d"
+       "900123\n"},
+      {"~2010109312345000012"
+       "~20137"
+       "48",
+       "0109312345000012\x1d"
+       "3748\n"},
+      {"CARTON 7/40", "CARTON 7/40\n"},
+  };
+  render::Drawing drawing(platform::DefaultPorts());
+  for (const int dotsPerInch : {300, 203}) {
+    for (const auto& test : cases) {
+      std::string png;
+      const auto device = MakePngDevice(Into(png), dotsPerInch);
+      device->StartPage(413, 583);
+      drawing.EAN128Barcode({*device, device->TwipsPerPixelX(), device->TwipsPerPixelY()}, test.data,
+                            {.x = 8, .y = 20, .height = 32, .barWidth = 0.5});
+      device->EndPage();
+      device->EndDoc();
+      EXPECT_EQ(Scanned(png), test.read) << dotsPerInch;
+    }
+  }
+}
+
+TEST(CairoBarcodeTest, ScannersReadTheBarsOfAPdf) {
+  render::Drawing drawing(platform::DefaultPorts());
+  const std::string pdf = DrawnPdf([&](DrawingDevice& device) {
+    const render::DrawingContext context{device, device.TwipsPerPixelX(), device.TwipsPerPixelY()};
+    device.StartPage(413, 583);
+    drawing.EAN13Barcode(context, "5901234123457", {.x = 20, .y = 80, .height = 30, .barWidth = 0.2});
+    drawing.EAN128Barcode(context, "~20100393123450000000017", {.x = 8, .y = 20, .height = 32, .barWidth = 0.5});
+    device.EndPage();
+  });
+  const std::string picture = testing::Told(pdf, "pdftoppm -r 300 -png \"$document\"");
+  EXPECT_THAT(Scanned(picture), HasSubstr("5901234123457\n"));
+  EXPECT_THAT(Scanned(picture), HasSubstr("00393123450000000017\n"));
+}
+
+}  // namespace
+}  // namespace partnerkit::cairo
