@@ -1,5 +1,5 @@
 # Puts the samples into the program, so that the demo needs no file beside it: of samples/mgb850 the main story's files, of each
-# other folder an order file, records and, for CSV, a map, named for the folder.
+# other folder its records and, where there are orders, their file and for CSV a map, named for the folder.
 function(partnerkit_demo_file path file)
   set_property(DIRECTORY ${PROJECT_SOURCE_DIR} APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${file})
   file(READ ${file} text)
@@ -18,7 +18,7 @@ foreach(folder IN LISTS folders)
   partnerkit_demo_file(records/${name}.json ${folder}/records.json)
   if(EXISTS ${folder}/orders.x12)
     partnerkit_demo_file(inbox/${name}.x12 ${folder}/orders.x12)
-  else()
+  elseif(EXISTS ${folder}/orders.csv)
     partnerkit_demo_file(maps/${name}.map ${folder}/${name}.map)
     partnerkit_demo_file(inbox/${name}.csv ${folder}/orders.csv)
   endif()

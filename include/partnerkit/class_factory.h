@@ -9,6 +9,7 @@
 
 namespace partnerkit {
 struct Ports;
+class LabelClass;
 class Translator;
 }  // namespace partnerkit
 
@@ -21,9 +22,11 @@ inline constexpr std::int32_t kPartnerKitNoSuchClass = static_cast<std::int32_t>
 inline constexpr std::int32_t kPartnerKitOutOfMemory = static_cast<std::int32_t>(0x8007000E);
 inline constexpr std::int32_t kPartnerKitCannotRegister = static_cast<std::int32_t>(0x80040201);
 
-// Puts a new object of the class into `*object`; the caller deletes it. `ports` null stands for
+// Puts a new object of a document's class into `*object`; the caller deletes it. `ports` null stands for
 // platform::DefaultPorts(). Another result than kPartnerKitOk leaves `*object` null.
 std::int32_t DllGetClassObject(const char* progId, const partnerkit::Ports* ports, partnerkit::Translator** object);
+// The same for a label class.
+std::int32_t DllGetLabelObject(const char* progId, const partnerkit::Ports* ports, partnerkit::LabelClass** object);
 // kPartnerKitOk when no object of the library is alive, so that it may be unloaded; else kPartnerKitFalse.
 std::int32_t DllCanUnloadNow();
 // Enters every public class with the path of this library; entries of other libraries stay.

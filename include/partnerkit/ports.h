@@ -112,6 +112,8 @@ struct ErrorSettings {
   bool passUpward = false;          // raise the error again for the calling component
 };
 
+class Spooler;
+
 // Everything a class is handed at its creation. The objects must outlive the class.
 struct Ports {
   Files* files = nullptr;
@@ -119,6 +121,10 @@ struct Ports {
   // The computer's name; nothing when the platform cannot tell.
   std::function<std::optional<std::string>()> computerName;
   ComponentFactory components;
+  // Where labels and tickets are printed; without one, no printer can be opened.
+  Spooler* spooler = nullptr;
+  // Called between labels and while a print queue is full, for a host to keep its windows alive. May be empty.
+  std::function<void()> yield;
   ErrorOutlets errorOutlets;
   ErrorSettings errorSettings;
 };

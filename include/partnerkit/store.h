@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -108,6 +109,36 @@ class System {
   // whatever crashes and however many programs share the store. Raises RunTimeError when the partner is unknown or the
   // store fails, and within BeginTrans, where a number could be taken back.
   virtual std::int32_t NextNumber(std::string_view partnerId, Counter counter) = 0;
+
+  // A setting of the host, by the names below; nothing for one that isn't set. A host without labels and tickets may
+  // leave this as it is. Classes ask at every step, so that a change counts at once.
+  virtual std::optional<std::string> Setting(std::string_view /*name*/) { return std::nullopt; }
+  // Sends text to the port of direct labels, `ComPort`. Raises RunTimeError when it cannot be sent.
+  virtual void ComSend(std::string_view text);
+
+  // "LBXII", "ZPL", "WinPCL" (an ordinary printer) or another word for what the printer of labels understands, and the
+  // same for tickets.
+  std::string PrinterLanguage() { return SettingText("PrinterLanguage"); }
+  std::string TicketLanguage() { return SettingText("TicketLanguage"); }
+  // Numbers that go into the packets of labels and of tickets, 0 when they aren't set.
+  std::string BatchControl() { return Setting("BatchControl").value_or("0"); }
+  std::string TicketBatchControl() { return Setting("TicketBatchControl").value_or("0"); }
+  // Labels go to `ComPort` and not to the spooler ("true" or "1"). An empty port means that there is none.
+  bool ComDirect();
+  std::string ComPort() { return SettingText("ComPort"); }
+  // Print queues are watched for room unless this is 2.
+  std::int32_t PlatformId();
+  // What the second free line of a label shows, and what it shows when the first is empty.
+  std::string LabelUserField() { return SettingText("LabelUserField"); }
+  std::string LabelUserFieldAlt() { return SettingText("LabelUserFieldAlt"); }
+  // The model of the packers' hand terminals.
+  std::string PDTType() { return SettingText("PDTType"); }
+
+  // What the last check of a scan found, see LabelClass::PackLineValid.
+  std::int32_t ErrorCode = 0;
+
+ private:
+  std::string SettingText(std::string_view name) { return Setting(name).value_or(std::string()); }
 };
 
 }  // namespace partnerkit

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "labels/label_classes.h"
 #include "orders/csv/csv_classes.h"
 #include "orders/x12/x12_classes.h"
 
@@ -11,6 +12,11 @@ namespace {
 
 template <class T>
 std::unique_ptr<Translator> Make(const Ports& ports) {
+  return std::make_unique<T>(ports);
+}
+
+template <class T>
+std::unique_ptr<LabelClass> MakeLabel(const Ports& ports) {
   return std::make_unique<T>(ports);
 }
 
@@ -30,6 +36,7 @@ constexpr PublicClass kClasses[] = {
     {"PartnerKit.clsTarget850ansix12",    "Purchase order (850)", "in", "ANSI X12", Make<orders::clsTarget850ansix12>},
     {"PartnerKit.clsGHPL850ansix12",      "Purchase order (850)", "in", "ANSI X12", Make<orders::clsGHPL850ansix12>},
     {"PartnerKit.clsKMart850ansix12",     "Purchase order (850, 860)", "in", "ANSI X12", Make<orders::clsKMart850ansix12>},
+    {"PartnerKit.clsCMLSCM",              "Shipping carton label", "label", "label", {}, MakeLabel<labels::clsCMLSCM>},
 };
 // clang-format on
 
@@ -52,7 +59,12 @@ const PublicClass* FindClass(std::string_view progId) {
 
 std::unique_ptr<Translator> CreateTranslator(std::string_view progId, const Ports& ports) {
   const PublicClass* const row = FindClass(progId);
-  return row == nullptr ? nullptr : row->create(ports);
+  return row == nullptr || row->create == nullptr ? nullptr : row->create(ports);
+}
+
+std::unique_ptr<LabelClass> CreateLabelClass(std::string_view progId, const Ports& ports) {
+  const PublicClass* const row = FindClass(progId);
+  return row == nullptr || row->createLabel == nullptr ? nullptr : row->createLabel(ports);
 }
 
 }  // namespace partnerkit

@@ -10,6 +10,7 @@
 #include "cli/demo.h"
 #include "cli/json_writer.h"
 #include "cli/listings.h"
+#include "cli/print_labels.h"
 #include "cli/printers.h"
 #include "cli/run_document.h"
 #include "cli/workspace.h"
@@ -56,6 +57,7 @@ class Verbs {
     AddWorkspaceVerbs();
     AddDataVerbs();
     AddRunVerbs();
+    AddLabelVerbs();
     AddPrinterVerbs();
   }
 
@@ -137,6 +139,43 @@ class Verbs {
         ->type_name("N");
   }
 
+  CLI::App* AddLabelVerb(const std::string& name, const std::string& about, const std::string& example, Action action) {
+    CLI::App* verb = Add(app_, name, about, example, std::move(action));
+    Required(verb, "CLASS", labels_.className, "The label class, such as PartnerKit.clsCMLSCM");
+    return verb;
+  }
+
+  CLI::App* AddPrintVerb(const std::string& name, const std::string& about, const std::string& example, Action action) {
+    CLI::App* verb = AddLabelVerb(name, about, example, std::move(action));
+    verb->add_option("--pack", labels_.packs, "Ids of the packs")->required()->type_name("ID...");
+    verb->add_option("--printer", labels_.printer, "The printer; else the workspace's only one, else its folder spool/")
+        ->type_name("P");
+    verb->add_option("--language", labels_.language, "In place of the setting PrinterLanguage: LBXII, ZPL or WinPCL")
+        ->type_name("L");
+    return verb;
+  }
+
+  void AddLabelVerbs() {
+    AddPrintVerb("print", "Print the labels of packs, a print job for each",
+                 "print PartnerKit.clsCMLSCM --pack 1 2 --printer warehouse",
+                 [this](const Command& command) { return PrintLabels(command, labels_, quantity_); })
+        ->add_option("--qty", quantity_, "Labels of each pack; ZPL and drawn labels are single")
+        ->check(CLI::Range(1, 32767))
+        ->type_name("N");
+    CLI::App* all = AddPrintVerb(
+        "print-all", "Print the labels of packs as one print job",
+        "print-all PartnerKit.clsCMLSCM --pack 1 2 3 --separators",
+        [this](const Command& command) { return PrintAllLabels(command, labels_, separators_, styleSort_); });
+    all->add_flag("--separators", separators_, "Put a separator label ahead of each store's labels");
+    all->add_flag("--style-sort", styleSort_, "From the last pack to the first, separators behind each prepack");
+    CLI::App* preview =
+        AddLabelVerb("preview", "Draw a pack's label as it would leave an ordinary printer",
+                     "preview PartnerKit.clsCMLSCM --pack 1 --out label.png",
+                     [this](const Command& command) { return PreviewLabel(command, labels_.className, pack_, file_); });
+    preview->add_option("--pack", pack_, "Id of the pack")->required()->type_name("ID");
+    preview->add_option("--out", file_, "The file, .png, .pdf or .svg")->required()->type_name("FILE");
+  }
+
   void AddPrinterVerbs() {
     CLI::App* verb = Add(app_, "printers", "List the printers and whether they can be reached",
                          "printers --test warehouse", [this](const Command& command) {
@@ -153,6 +192,10 @@ class Verbs {
   std::vector<std::string> words_;
   std::vector<std::int64_t> rows_;
   std::int64_t row_ = 0;
+  LabelOrder labels_;
+  std::int16_t quantity_ = 1;
+  std::int32_t pack_ = 0;
+  bool separators_ = false, styleSort_ = false;
   std::int32_t since_ = 0;
   bool test_ = false;
 };

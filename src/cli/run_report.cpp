@@ -5,17 +5,13 @@
 #include <string_view>
 
 #include "cli/json_writer.h"
-#include "cli/listings.h"
-#include "cli/record_json.h"
+#include "cli/log_report.h"
 #include "cli/table.h"
 #include "cli/text.h"
 
 namespace partnerkit::cli {
 
 namespace {
-
-// What scripts are promised of a log record; `log` shows the whole.
-constexpr std::string_view kLogMembers[] = {"LogId", "Source", "Procedure", "ErrorNumber", "NativeError", "Message"};
 
 void WriteColumns(JsonWriter& json, const ColumnTable& columns) {
   json.Name("columns");
@@ -67,38 +63,6 @@ void WriteResults(JsonWriter& json, const std::vector<RowResult>& results) {
   json.EndArray();
 }
 
-void WriteLog(JsonWriter& json, const std::vector<std::int32_t>& logIds, RecordStore& store) {
-  json.Name("log");
-  json.BeginArray();
-  for (const std::int32_t logId : logIds) {
-    Log log;
-    log.LogId = logId;
-    // A record taken back with its transaction is no record.
-    if (!store.Load(Log::kType, &log)) continue;
-    json.BeginObject();
-    for (const std::string_view name : kLogMembers) {
-      const Member& member = *FindMember(Log::kType, name);
-      json.Name(name);
-      WriteValue(json, member.kind, At(member, &log));
-    }
-    json.EndObject();
-  }
-  json.EndArray();
-}
-
-// "rejection: Cannot process ..."
-std::vector<std::string> Messages(const std::vector<std::int32_t>& logIds, RecordStore& store) {
-  std::vector<std::string> messages;
-  for (const std::int32_t logId : logIds) {
-    Log log;
-    log.LogId = logId;
-    if (!store.Load(Log::kType, &log)) continue;
-    const std::string kind = ErrorNumberText(log.ErrorNumber);
-    messages.push_back((kind.empty() ? "" : kind + ": ") + OneLine(Str(log.Message)));
-  }
-  return messages;
-}
-
 std::string Told(const RowResult* result) {
   if (result == nullptr) return {};
   switch (result->outcome) {
@@ -130,7 +94,7 @@ void PrintGrid(const Command& command, const RunReport& report, RecordStore& sto
   if (done) {
     notes = [&](std::size_t line) {
       const ErrorList& list = report.results[line].errorLog;
-      return Messages(list.value_or(std::vector<std::int32_t>()), store);
+      return LogMessages(list.value_or(std::vector<std::int32_t>()), store);
     };
   }
   PrintTable(command.out, columns, done ? report.results.size() : report.rows.Rows(), cell, OutputWidth(), notes);
@@ -159,7 +123,7 @@ void PrintOtherMessages(const Command& command, const RunReport& report, RecordS
   }
   std::ranges::sort(shown);
   std::ranges::set_difference(report.logIds, shown, std::back_inserter(others));
-  for (const std::string& message : Messages(others, store)) PrintWrapped(command.out, message, 2, OutputWidth());
+  for (const std::string& message : LogMessages(others, store)) PrintWrapped(command.out, message, 2, OutputWidth());
 }
 
 }  // namespace
@@ -171,7 +135,7 @@ void PrintRun(const Command& command, const RunReport& report, RecordStore& stor
     WriteColumns(json, report.columns);
     WriteRows(json, report.rows);
     if (report.withResults) WriteResults(json, report.results);
-    WriteLog(json, report.logIds, store);
+    WriteLogRecords(json, report.logIds, store);
     json.EndObject();
     return;
   }

@@ -30,6 +30,7 @@ class WatchedHost : public System, private RecordStore {
   std::int32_t NextNumber(std::string_view partnerId, Counter counter) override {
     return host_.NextNumber(partnerId, counter);
   }
+  std::optional<std::string> Setting(std::string_view name) override { return host_.Setting(name); }
 
  private:
   bool Load(const RecordType& type, void* record) override { return records_.Load(type, record); }

@@ -53,12 +53,21 @@ class HostedClass {
   }
   ErrorHandling& Errors() { return errors_; }
 
+  // "PartnerKit.clsMGB850csv".
+  const std::string& OwnProgId() const { return progId_; }
+
   System& Host() const { return *system_; }
   RecordStore& Records() const { return system_->Records(); }
   Files& FileSystem() const { return *ports_.files; }
   Clock& WallClock() const { return *ports_.clock; }
   DateTime Now() const { return ports_.clock->Now(); }
   const ComponentFactory& Components() const { return ports_.components; }
+  // Null when the host has none.
+  Spooler* PrintSpooler() const { return ports_.spooler; }
+  // Lets the host see to its own events.
+  void Yield() const {
+    if (ports_.yield) ports_.yield();
+  }
 
  protected:
   // `className` is "clsMGB850csv"; the error trail knows the class as `moduleLabel`, "cMGB850csv" when it is empty.
@@ -66,7 +75,6 @@ class HostedClass {
   ~HostedClass();
 
   void SetHost(System& system) { system_ = &system; }
-  const std::string& OwnProgId() const { return progId_; }
   std::int32_t LastLogId() const { return lastLogId_; }
 
  private:

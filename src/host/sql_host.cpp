@@ -50,7 +50,8 @@ struct SqlHost::Parts {
   SqlSession session;
   SqlStore store;
   std::map<std::string, std::unique_ptr<Statement>> statements;
-  std::optional<std::string> userId;
+  std::map<std::string, std::optional<std::string>, std::less<>> settings;
+  std::optional<std::string> loginName;
 };
 
 SqlHost::SqlHost(std::unique_ptr<Parts> parts) : parts_(std::move(parts)) {}
@@ -68,9 +69,9 @@ SqlStore& SqlHost::Records() { return parts_->store; }
 SqlSession& SqlHost::Session() { return parts_->session; }
 
 std::string SqlHost::UserId() {
-  // Every log record asks for it.
-  if (!parts_->userId) parts_->userId = Setting("UserId").value_or(LoginName());
-  return *parts_->userId;
+  if (std::optional<std::string> user = Setting("UserId")) return *std::move(user);
+  if (!parts_->loginName) parts_->loginName = LoginName();
+  return *parts_->loginName;
 }
 
 void SqlHost::Commit(std::int32_t) { parts_->session.Commit(); }
@@ -79,7 +80,7 @@ void SqlHost::CommitTrans() { parts_->session.CommitExplicit(); }
 
 void SqlHost::RollbackTrans() {
   parts_->session.RollbackExplicit();
-  parts_->userId.reset();
+  parts_->settings.clear();
 }
 
 void SqlHost::Close() { parts_->session.Close(); }
@@ -163,14 +164,17 @@ std::int32_t SqlHost::NextNumber(std::string_view partnerId, Counter counter) {
 }
 
 std::optional<std::string> SqlHost::Setting(std::string_view name) {
-  return parts_->session.Guarded([&]() -> std::optional<std::string> {
+  // Every log record and every label asks for some.
+  const auto kept = parts_->settings.find(name);
+  if (kept != parts_->settings.end()) return kept->second;
+  return parts_->session.Guarded([&] {
     Statement& find = parts_->Prepared("SELECT \"Value\" FROM " + Quoted(kSettingsTable) + " WHERE \"Name\"=:p0",
                                        {MemberKind::kString}, {MemberKind::kString});
     find.Parameter(0).Set(name);
     std::optional<std::string> value;
     if (find.Execute()) value = find.Column(0).text;
     find.Reset();
-    return value;
+    return parts_->settings.emplace(name, std::move(value)).first->second;
   });
 }
 
@@ -201,7 +205,7 @@ void SqlHost::SetSetting(std::string_view name, std::string_view value) {
     add.Parameter(1).Set(name);
     add.Execute();
   });
-  if (name == "UserId") parts_->userId = value;
+  parts_->settings.erase(std::string(name));
 }
 
 }  // namespace partnerkit::host

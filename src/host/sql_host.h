@@ -48,8 +48,9 @@ class SqlHost : public System {
   // Commits what waits for it. Raises RunTimeError.
   void Close();
 
-  // The host's settings, the members of `System` by name. They raise RunTimeError.
-  std::optional<std::string> Setting(std::string_view name);
+  // The host's settings, the members of `System` by name. They raise RunTimeError. One that was asked for is kept, so
+  // that a change by another program counts from the next opening on.
+  std::optional<std::string> Setting(std::string_view name) override;
   std::vector<std::pair<std::string, std::string>> Settings();
   void SetSetting(std::string_view name, std::string_view value);
 

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "labels/label_layout.h"
+#include "render/label_drawing.h"
 
 namespace partnerkit::labels {
 
@@ -75,6 +76,32 @@ inline constexpr PacketRecord kCmlCartonBatch[] = {
     {R"(27,"`User2`"|)"},
     {R"(28,"`PalletText`"|)"},
     {R"(29,"`ForLocnName`"|)"},
+};
+
+// Where an ordinary printer's texts go instead, so that they stand as the label printer's do.
+inline constexpr render::FieldMove kCmlCartonFieldMoves[] = {
+    { .number = 1,  .rows = 20,  .cols = 8 },
+    { .number = 2,  .rows = 15             },
+    { .number = 3,  .rows = 15             },
+    { .number = 4,  .rows = 20,  .cols = 10},
+    { .number = 5,  .rows = 15,  .cols = 10},
+    { .number = 6,  .rows = -10, .cols = 8 },
+    { .number = 9,  .rows = 30,              .font = 3},
+    { .number = 10,              .cols = 12},
+    { .number = 14, .rows = 48             },
+    { .number = 17, .rows = 10             },
+    { .number = 18, .rows = 10             },
+    { .number = 19, .rows = 45             },
+    { .number = 20, .rows = 35             },
+    { .number = 21,              .cols = 50},
+    { .number = 26,              .cols = 50},
+    { .number = 27,              .cols = 50},
+};
+inline constexpr render::FieldMove kCmlCartonConstantMoves[] = {
+    { .number = 2, .rows = 20  },
+    { .number = 5, .rows = 20  },
+    { .number = 7, .rows = 15  },
+    { .number = 9, .rows = -10 },
 };
 // clang-format on
 

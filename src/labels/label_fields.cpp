@@ -3,6 +3,7 @@
 #include "frame/delimited.h"
 #include "frame/format.h"
 #include "frame/numbers.h"
+#include "frame/windows_1252.h"
 
 namespace partnerkit::labels {
 
@@ -11,6 +12,9 @@ namespace {
 constexpr std::size_t kUserLine = 30;
 constexpr std::size_t kPostcode = 4;
 constexpr std::size_t kSSCC = 18;
+
+// Cut as printers count, a byte for each character.
+std::string Short(std::string_view text, std::size_t n) { return std::string(Cut(Windows1252(text), n)); }
 
 std::string Upper(std::string_view text) { return Format(text, ">"); }
 std::string LocationNo(std::string_view number) { return Format(number, "0000"); }
@@ -24,9 +28,9 @@ class Filling {
     Partner vendor;
     vendor.PartnerId = pack_.VendorId;
     Read(vendor);
-    values_.FromName = Cut(Str(vendor.Name), 15);
-    values_.FromSuburb = Cut(Str(vendor.Suburb), cuts_.FromSuburb);
-    values_.FromState = Cut(Str(vendor.State), 3);
+    values_.FromName = Short(Str(vendor.Name), 15);
+    values_.FromSuburb = Short(Str(vendor.Suburb), cuts_.FromSuburb);
+    values_.FromState = Short(Str(vendor.State), 3);
   }
 
   void Carrier() {
@@ -34,38 +38,38 @@ class Filling {
     PartnerAddress carrier;
     carrier.Id = pack_.PartnerLocnId == 0 ? delivery_.CarrierId : pack_.CarrierId;
     if (carrier.Id != 0) Read(carrier);
-    values_.CarrierName = Cut(Str(carrier.Name), cuts_.CarrierName);
+    values_.CarrierName = Short(Str(carrier.Name), cuts_.CarrierName);
     Shipment shipment;
     shipment.Id = pack_.ShipmentId;
     if (shipment.Id != 0) Read(shipment);
-    values_.ConNoteNo = Cut(Str(shipment.ConNoteNo), cuts_.ConNoteNo);
-    values_.BillOfLadingNo = Cut(Str(shipment.BillOfLadingNo), cuts_.BillOfLadingNo);
+    values_.ConNoteNo = Short(Str(shipment.ConNoteNo), cuts_.ConNoteNo);
+    values_.BillOfLadingNo = Short(Str(shipment.BillOfLadingNo), cuts_.BillOfLadingNo);
   }
 
   void DeliveryPoint() {
     const std::string_view through = Str(delivery_.DeliverToCode);
     const PartnerLocn to = Location(TrimBlanks(through).empty() ? std::string_view(pack_.ShipToCode) : through);
-    values_.ToName = Cut(TrimBlanks(Str(to.ShortName)), cuts_.ToName);
+    values_.ToName = Short(TrimBlanks(Str(to.ShortName)), cuts_.ToName);
     if (Upper(TrimBlanks(Str(to.Name))) == "DC") values_.ToName = std::string(Cut(values_.ToName, 7)) + " DC";
-    values_.ToAddress = Cut(Str(to.Address1), 20);
-    values_.ToSuburb = Cut(Str(to.Suburb), 15);
-    values_.ToPostcode = Cut(Str(to.Postcode), kPostcode);
+    values_.ToAddress = Short(Str(to.Address1), 20);
+    values_.ToSuburb = Short(Str(to.Suburb), 15);
+    values_.ToPostcode = Short(Str(to.Postcode), kPostcode);
     values_.ToLocnNo = LocationNo(to.PartnerLocnNo);
   }
 
   void FinalStore() {
     const PartnerLocn store = Location(pack_.BuyStoreCode);
     values_.FinalLocnNo = store.PartnerLocnNo == "DC" ? values_.ToLocnNo : LocationNo(store.PartnerLocnNo);
-    values_.CountryCode = Cut(Str(store.CountryCode), 3);
-    values_.ForName = Cut(TrimBlanks(Str(store.ShortName)), cuts_.ForName);
-    values_.ForLocnName = Cut(Str(store.Name), cuts_.ForLocnName);
-    values_.ForAddress = Cut(Str(store.Address1), cuts_.ForAddress);
-    values_.ForSuburb = Cut(Str(store.Suburb), cuts_.ForSuburb);
-    values_.ForPostcode = Cut(Str(store.Postcode), kPostcode);
+    values_.CountryCode = Short(Str(store.CountryCode), 3);
+    values_.ForName = Short(TrimBlanks(Str(store.ShortName)), cuts_.ForName);
+    values_.ForLocnName = Short(Str(store.Name), cuts_.ForLocnName);
+    values_.ForAddress = Short(Str(store.Address1), cuts_.ForAddress);
+    values_.ForSuburb = Short(Str(store.Suburb), cuts_.ForSuburb);
+    values_.ForPostcode = Short(Str(store.Postcode), kPostcode);
     values_.ForLocnNo = LocationNo(store.PartnerLocnNo);
     if (Str(Order().TypeCode) != "CO") return;
     // A customer's order shows the customer, and no store.
-    values_.ForName = Cut(TrimBlanks(Str(Order().Header3)), 30);
+    values_.ForName = Short(TrimBlanks(Str(Order().Header3)), 30);
     for (std::string* text :
          {&values_.ForLocnName, &values_.ForAddress, &values_.ForSuburb, &values_.ForPostcode, &values_.ForLocnNo}) {
       text->clear();
@@ -86,13 +90,13 @@ class Filling {
     if (const std::size_t release = number.find(" REL# "); release != std::string_view::npos && release > 0) {
       number = number.substr(0, release);
     }
-    values_.POText = std::string("PO ").append(Cut(number, 22));
+    values_.POText = "PO " + Short(number, 22);
     const std::string_view advertised = Str(Order().Header1);
     const bool dated = advertised.size() > 1;
-    values_.ADDate = dated ? Cut(advertised, 4) : std::string_view();
+    values_.ADDate = dated ? Short(advertised, 4) : std::string();
     values_.ADFlag = dated && advertised.size() > 3 && DecimalOf(advertised) ? "AD" : "";
-    values_.DeptText = Cut(Str(Order().Header2), 15);
-    if (values_.DeptText.empty()) values_.DeptText = Str(Order().DeptNo);
+    values_.DeptText = Short(Str(Order().Header2), 15);
+    if (values_.DeptText.empty()) values_.DeptText = Windows1252(Str(Order().DeptNo));
   }
 
   void Capitals() {
@@ -133,6 +137,13 @@ class Filling {
 }  // namespace
 
 void FillValues(HostedClass& label, const Pack& pack, const FieldCuts& cuts, LabelValues& values) {
+  LabelValues fresh;
+  for (const auto given :
+       {&LabelValues::User1, &LabelValues::User2, &LabelValues::StoreZoneDept, &LabelValues::ComponentItem,
+        &LabelValues::ComponentCount, &LabelValues::ComponentStyle, &LabelValues::FormatNo, &LabelValues::Qty}) {
+    fresh.*given = std::move(values.*given);
+  }
+  values = std::move(fresh);
   label.Procedure("Sub FillValues", false, [&](bool&) {
     Filling filling(label, pack, cuts, values);
     filling.Sender();

@@ -23,7 +23,8 @@ struct FieldCuts {
 };
 
 // Null members, and records that aren't there, give empty texts; a location that isn't there still gives the number
-// that it was looked for by. `User1` and `User2` are only cut.
+// that it was looked for by. What the host has set (free lines, zone, component) stays, cut to its length. A failure
+// ends the filling; what was not filled by then is empty, never another carton's.
 void FillValues(HostedClass& label, const Pack& pack, const FieldCuts& cuts, LabelValues& values);
 
 // The first n characters.

@@ -80,16 +80,30 @@ std::int32_t Registering(F change) {
 
 using namespace partnerkit;
 
-std::int32_t DllGetClassObject(const char* progId, const Ports* ports, Translator** object) {
+namespace {
+
+template <class Class>
+std::int32_t GetObject(const char* progId, const Ports* ports, Class** object,
+                       std::unique_ptr<Class> (*create)(std::string_view, const Ports&)) {
   if (object == nullptr) return kPartnerKitBadPointer;
   *object = nullptr;
   if (progId == nullptr) return kPartnerKitBadPointer;
   try {
-    *object = CreateTranslator(progId, ports != nullptr ? *ports : platform::DefaultPorts()).release();
+    *object = create(progId, ports != nullptr ? *ports : platform::DefaultPorts()).release();
   } catch (const std::exception&) {
     return kPartnerKitOutOfMemory;
   }
   return *object != nullptr ? kPartnerKitOk : kPartnerKitNoSuchClass;
+}
+
+}  // namespace
+
+std::int32_t DllGetClassObject(const char* progId, const Ports* ports, Translator** object) {
+  return GetObject(progId, ports, object, CreateTranslator);
+}
+
+std::int32_t DllGetLabelObject(const char* progId, const Ports* ports, LabelClass** object) {
+  return GetObject(progId, ports, object, CreateLabelClass);
 }
 
 std::int32_t DllCanUnloadNow() { return LiveObjects() == 0 ? kPartnerKitOk : kPartnerKitFalse; }

@@ -48,4 +48,8 @@ std::unique_ptr<Destination> MakeCupsQueue(const std::string& queue, const TimeO
 // given. Jobs are named "tcp:host:9100".
 std::unique_ptr<Destination> MakeSocket(const std::string& target, const TimeOuts& timeOuts);
 
+// A port that labels go to directly: the path of a device, "LPT1" and "COM1" and so on for this machine's own, or else
+// a socket's target. Jobs are named "port:/dev/lp0".
+std::unique_ptr<Destination> MakePort(const std::string& port, const TimeOuts& timeOuts);
+
 }  // namespace partnerkit::spool

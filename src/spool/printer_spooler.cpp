@@ -20,7 +20,7 @@ constexpr double kTwipsPerDot = 1440.0 / 300;
 // Kept here until it is complete: a printer that has bytes cannot be made to forget them.
 class PrinterSpooler::Job : public RawJob {
  public:
-  Job(PrinterSpooler& spooler, std::unique_ptr<Destination> destination, std::string document, Content content)
+  Job(PrinterSpooler& spooler, std::shared_ptr<Destination> destination, std::string document, Content content)
       : spooler_(spooler), destination_(std::move(destination)), document_(std::move(document)), content_(content) {}
 
   void Write(std::string_view bytes) override {
@@ -40,7 +40,7 @@ class PrinterSpooler::Job : public RawJob {
   }
 
   PrinterSpooler& spooler_;
-  std::unique_ptr<Destination> destination_;
+  std::shared_ptr<Destination> destination_;
   std::string document_;
   Content content_;
   std::string bytes_;
@@ -83,7 +83,13 @@ std::unique_ptr<RawJob> PrinterSpooler::OpenJob(const std::string& printer, cons
 
 void PrinterSpooler::Check(const std::string& printer) { DestinationOf(printer)->Check(); }
 
-std::unique_ptr<Destination> PrinterSpooler::DestinationOf(const std::string& name) const {
+std::shared_ptr<Destination> PrinterSpooler::DestinationOf(const std::string& name) {
+  std::shared_ptr<Destination>& known = destinations_[name];
+  if (known == nullptr) known = MakeDestination(name);
+  return known;
+}
+
+std::unique_ptr<Destination> PrinterSpooler::MakeDestination(const std::string& name) const {
   const auto printer = std::ranges::find(printers_, name, &Printer::Name);
   if (printer == printers_.end()) platform::Raise(run_time::kPrinter, name, "There is no such printer");
   const std::string target = printer->Target.value_or("");
@@ -92,6 +98,10 @@ std::unique_ptr<Destination> PrinterSpooler::DestinationOf(const std::string& na
   if (printer->Kind == "cups") return MakeCupsQueue(target, timeOuts_);
   if (printer->Kind == "tcp") return MakeSocket(target, timeOuts_);
   platform::Raise(run_time::kPrinter, name, "The printer's Kind \"" + printer->Kind + "\" is not file, cups or tcp");
+}
+
+void PrinterSpooler::SendToPort(const std::string& port, std::string_view bytes) {
+  if (!bytes.empty()) AddJob(MakePort(port, timeOuts_)->Deliver(bytes, Content::kRaw, port));
 }
 
 void PrinterSpooler::AddJob(const std::string& name) {

@@ -1,0 +1,18 @@
+#include "frame/numbers.h"
+#include "partnerkit/run_time_error.h"
+#include "partnerkit/store.h"
+
+namespace partnerkit {
+
+void System::ComSend(std::string_view) {
+  throw RunTimeError(run_time::kDeviceError, "This host has no port for direct labels");
+}
+
+bool System::ComDirect() {
+  const std::string set = SettingText("ComDirect");
+  return set == "true" || set == "1";
+}
+
+std::int32_t System::PlatformId() { return ToLong(NumberAtStart(SettingText("PlatformId"))); }
+
+}  // namespace partnerkit
