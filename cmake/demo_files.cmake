@@ -1,5 +1,5 @@
 # Puts the samples into the program, so that the demo needs no file beside it: of samples/mgb850 the main story's files, of each
-# other folder its records and, where there are orders, their file and for CSV a map, named for the folder.
+# other folder with orders its records, the order file and, for CSV, a map, named for the folder; packed cartons by themselves.
 function(partnerkit_demo_file path file)
   set_property(DIRECTORY ${PROJECT_SOURCE_DIR} APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${file})
   file(READ ${file} text)
@@ -15,10 +15,14 @@ file(GLOB folders CONFIGURE_DEPENDS LIST_DIRECTORIES true ${samples}/*)
 list(REMOVE_ITEM folders ${samples}/mgb850)
 foreach(folder IN LISTS folders)
   cmake_path(GET folder FILENAME name)
+  if(NOT EXISTS ${folder}/orders.x12 AND NOT EXISTS ${folder}/orders.csv)
+    partnerkit_demo_file(cartons.json ${folder}/records.json)
+    continue()
+  endif()
   partnerkit_demo_file(records/${name}.json ${folder}/records.json)
   if(EXISTS ${folder}/orders.x12)
     partnerkit_demo_file(inbox/${name}.x12 ${folder}/orders.x12)
-  elseif(EXISTS ${folder}/orders.csv)
+  else()
     partnerkit_demo_file(maps/${name}.map ${folder}/${name}.map)
     partnerkit_demo_file(inbox/${name}.csv ${folder}/orders.csv)
   endif()

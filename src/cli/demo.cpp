@@ -148,6 +148,20 @@ std::vector<Step> OtherPartners() {
   };
 }
 
+// Cartons that are packed and wait for their labels.
+std::vector<Step> Labels() {
+  return {
+      {"CML wants a label on every carton. Three of an order are packed:", {"data", "load", "cartons.json"}, kDone},
+      {"The label printer gets the layout once, and then a job of values for each carton. Without a printer of its own the "
+       "workspace keeps them in spool/:",
+       {"print", "PartnerKit.clsCMLSCM", "--pack", "901", "902", "903"},
+       kDone},
+      {"The same label on an ordinary printer, or here as a picture:",
+       {"preview", "PartnerKit.clsCMLSCM", "--pack", "901", "--out", "label.png"},
+       kDone},
+  };
+}
+
 void PrintOrders(const Command& command) {
   Command inWorkspace = command;
   inWorkspace.options.workspace = ".";
@@ -233,6 +247,7 @@ void Talk(const Command& command, Steps& steps, const fs::path& workspace, const
   TellFiles(command);
   for (const Step& step : OtherPartners()) TellStep(command, steps, step);
   TellAcknowledgement(command);
+  for (const Step& step : Labels()) TellStep(command, steps, step);
   Tell(command,
        "To go on with the order of MGB that failed: correct the price in records.json, load it again and run the same "
        "`process` command.");
