@@ -50,7 +50,8 @@ class DrawingDevice {
   virtual void Rectangle(const PixelRect& rect, int penWidth) = 0;
 
   // Draws 8-bit text (Windows-1252) on a ground as long as the text and as high as the font, the upper left corner of
-  // which is at (x, y).
+  // which is at (x, y). A white ground is the paper's own and hides nothing: texts of a label may overlap with their
+  // cells, for a printer's fonts fill less of these than a screen's.
   virtual void Text(int x, int y, std::string_view text, const Font& font, const TextInks& inks) = 0;
 };
 

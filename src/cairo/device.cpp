@@ -1,7 +1,6 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdint>
-#include <limits>
 #include <optional>
 #include <vector>
 
@@ -50,6 +49,7 @@ class CairoDevice : public DrawingDevice {
   }
   void Use(Ink ink);
   void AddBar(const Box& box);
+  void AddPath(const Box& box);
   void DrawBars();
   void Fill(const Box& box, Ink ink);
   std::optional<Box> OnPage(const Box& box) const;
@@ -123,9 +123,9 @@ void CairoDevice::Rectangle(const PixelRect& rect, int penWidth) {
     return;
   }
   AddBar({outer.left, outer.top, outer.right, inner.top});
-  AddBar({outer.left, inner.top, inner.left, inner.bottom});
-  AddBar({inner.right, inner.top, outer.right, inner.bottom});
   AddBar({outer.left, inner.bottom, outer.right, outer.bottom});
+  AddBar({outer.left, outer.top, inner.left, outer.bottom});
+  AddBar({inner.right, outer.top, outer.right, outer.bottom});
 }
 
 // Bars that touch become one, so that no viewer shows a seam between a symbol's modules.
@@ -143,15 +143,17 @@ void CairoDevice::AddBar(const Box& box) {
   bars_.push_back(*bar);
 }
 
-void AddPath(cairo_t* page, const Box& box) {
-  cairo_rectangle(page, static_cast<double>(box.left), static_cast<double>(box.top),
-                  static_cast<double>(box.right - box.left), static_cast<double>(box.bottom - box.top));
+void CairoDevice::AddPath(const Box& box) {
+  const double inset = output_->Inset();
+  cairo_rectangle(page_.get(), static_cast<double>(box.left) + inset, static_cast<double>(box.top) + inset,
+                  static_cast<double>(box.right - box.left) - 2 * inset,
+                  static_cast<double>(box.bottom - box.top) - 2 * inset);
 }
 
 void CairoDevice::DrawBars() {
   if (bars_.empty()) return;
   Use(Ink::kBlack);
-  for (const Box& bar : bars_) AddPath(page_.get(), bar);
+  for (const Box& bar : bars_) AddPath(bar);
   bars_.clear();
   cairo_fill(page_.get());
   output_->CheckAll(cairo_status(page_.get()));
@@ -161,7 +163,7 @@ void CairoDevice::Fill(const Box& box, Ink ink) {
   const std::optional<Box> seen = OnPage(box);
   if (!seen) return;
   Use(ink);
-  AddPath(page_.get(), *seen);
+  AddPath(*seen);
   cairo_fill(page_.get());
 }
 
@@ -185,7 +187,9 @@ void CairoDevice::Text(int x, int y, std::string_view text, const Font& font, co
   SizedFont& sized = fonts_.Find(font, static_cast<int>(height), static_cast<int>(width));
   const double right = LayOut(x, y + sized.face.Ascent() * sized.sizeY, text, sized);
   DrawBars();
-  Fill({x, y, static_cast<std::int64_t>(std::ceil(right)), y + static_cast<std::int64_t>(height)}, inks.ground);
+  if (inks.ground != Ink::kWhite) {
+    Fill({x, y, static_cast<std::int64_t>(std::ceil(right)), y + static_cast<std::int64_t>(height)}, inks.ground);
+  }
   DrawGlyphs(sized, inks.text);
   output_->CheckAll(cairo_status(page_.get()));
 }

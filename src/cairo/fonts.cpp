@@ -2,7 +2,7 @@
 
 #include <strings.h>
 
-#include <string_view>
+#include <utility>
 
 #include "frame/windows_1252.h"
 #include "partnerkit/run_time_error.h"
@@ -45,7 +45,7 @@ std::string Family(std::string_view name) {
 
 }  // namespace
 
-Face::Face(std::string_view name, bool bold) {
+Face::Face(std::string_view name, bool bold) : name_(name) {
   const std::string family = Family(name);
   face_.reset(cairo_toy_font_face_create(family.c_str(), CAIRO_FONT_SLANT_NORMAL,
                                          bold ? CAIRO_FONT_WEIGHT_BOLD : CAIRO_FONT_WEIGHT_NORMAL));
@@ -96,16 +96,18 @@ double Face::AverageWidth() {
 
 SizedFont& Fonts::Find(const Font& font, int height, int width) {
   const bool bold = font.weight >= kBold;
-  const auto found = fonts_.find(std::tuple(font.name, bold, height, width));
+  const auto found = fonts_.find(FontKey(font.name, bold, height, width));
   if (found != fonts_.end()) return found->second;
-  SizedFont sized = Scaled(FindFace(font.name, bold), height, width);
-  return fonts_.try_emplace({std::string(font.name), bold, height, width}, std::move(sized)).first->second;
+  Face& face = FindFace(font.name, bold);
+  return fonts_.try_emplace(FontKey(face.Name(), bold, height, width), Scaled(face, height, width)).first->second;
 }
 
 Face& Fonts::FindFace(std::string_view name, bool bold) {
-  const auto found = faces_.find(std::tuple(name, bold));
-  if (found != faces_.end()) return found->second;
-  return faces_.try_emplace({std::string(name), bold}, name, bold).first->second;
+  const auto found = faces_.find(FaceKey(name, bold));
+  if (found != faces_.end()) return *found->second;
+  auto face = std::make_unique<Face>(name, bold);
+  const FaceKey key(face->Name(), bold);
+  return *faces_.try_emplace(key, std::move(face)).first->second;
 }
 
 SizedFont Fonts::Scaled(Face& face, int height, int width) const {

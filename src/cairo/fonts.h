@@ -3,6 +3,7 @@
 
 #include <array>
 #include <map>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <tuple>
@@ -24,6 +25,7 @@ class Face {
  public:
   Face(std::string_view name, bool bold);
 
+  const std::string& Name() const { return name_; }
   cairo_font_face_t* Handle() const { return face_.get(); }
   double Ascent() const { return ascent_; }
   double CellHeight() const { return cellHeight_; }
@@ -34,6 +36,7 @@ class Face {
  private:
   void Measure(char byte, Character& character);
 
+  std::string name_;
   FontFace face_;
   ScaledFont measured_;
   double ascent_ = 0, cellHeight_ = 0;
@@ -59,12 +62,16 @@ class Fonts {
   SizedFont& Find(const Font& font, int height, int width);
 
  private:
+  // Name, bold; and height, width. A stored key's name is that of its face.
+  using FaceKey = std::tuple<std::string_view, bool>;
+  using FontKey = std::tuple<std::string_view, bool, int, int>;
+
   Face& FindFace(std::string_view name, bool bold);
   SizedFont Scaled(Face& face, int height, int width) const;
 
   double unitsPerPixel_;
-  std::map<std::tuple<std::string, bool>, Face, std::less<>> faces_;
-  std::map<std::tuple<std::string, bool, int, int>, SizedFont, std::less<>> fonts_;
+  std::map<FaceKey, std::unique_ptr<Face>> faces_;
+  std::map<FontKey, SizedFont> fonts_;
 };
 
 }  // namespace partnerkit::cairo

@@ -24,6 +24,8 @@ class Output {
 
   // How large a pixel is in the surface's own units.
   virtual double UnitsPerPixel() const = 0;
+  // What is left out at each edge of a filled rectangle, in pixels.
+  virtual double Inset() const { return 0; }
   // A white page.
   virtual void StartPage(const PageSize& size) = 0;
   virtual void EndPage(cairo_t* page) { cairo_show_page(page); }

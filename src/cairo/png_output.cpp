@@ -2,6 +2,7 @@
 // and black ink takes it off, so that its rows are those of the picture.
 #include <png.h>
 
+#include <cmath>
 #include <csetjmp>
 #include <cstdio>
 #include <vector>
@@ -35,7 +36,7 @@ class PngWriter {
 
   void Write(std::vector<png_byte*>& rows, int width, int dotsPerInch) {
     if (Written(rows.data(), {static_cast<png_uint_32>(width), static_cast<png_uint_32>(rows.size())},
-                static_cast<png_uint_32>(dotsPerInch * kInchesPerMetre + 0.5))) {
+                static_cast<png_uint_32>(std::lround(dotsPerInch * kInchesPerMetre)))) {
       return;
     }
     stream_.RaiseFailure();

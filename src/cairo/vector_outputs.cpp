@@ -11,12 +11,17 @@ namespace {
 
 constexpr double kPointsPerInch = 72;
 
+// A printer blackens each dot that a shape touches, however little. Cairo rounds to 1/256 of a point, so that a bar
+// that ends with a pixel may reach into the next one, which widens it by a whole dot.
+constexpr double kInset = 1.0 / 32;
+
 class VectorOutput : public Output {
  public:
   VectorOutput(ByteSink sink, int dotsPerInch)
       : Output(std::move(sink)), unitsPerPixel_(kPointsPerInch / dotsPerInch) {}
 
   double UnitsPerPixel() const override { return unitsPerPixel_; }
+  double Inset() const override { return kInset; }
 
  private:
   double unitsPerPixel_;

@@ -5,6 +5,8 @@
 namespace partnerkit::cairo {
 namespace {
 
+using ::testing::StartsWith;
+
 // What a scanner reads, a symbol a line, without the names of their kinds.
 std::string Scanned(const std::string& picture) {
   return testing::Told(picture, "zbarimg --nodbus --quiet --raw \"$document\" 2>/dev/null");
@@ -44,18 +46,27 @@ TEST(CairoBarcodeTest, ScannersReadWhatWasDrawn) {
   }
 }
 
-TEST(CairoBarcodeTest, ScannersReadTheBarsOfAPdf) {
+// As a printer does that blackens every dot which a shape touches.
+TEST(CairoBarcodeTest, APrintedPdfHasTheDotsOfThePicture) {
   render::Drawing drawing(platform::DefaultPorts());
-  const std::string pdf = DrawnPdf([&](DrawingDevice& device) {
-    const render::DrawingContext context{device, device.TwipsPerPixelX(), device.TwipsPerPixelY()};
-    device.StartPage(413, 583);
+  const Draw draw = [&](DrawingDevice& device) {
+    const render::DrawingContext context{device, 4.8, 4.8};
     drawing.EAN13Barcode(context, "5901234123457", {.x = 20, .y = 80, .height = 30, .barWidth = 0.2});
     drawing.EAN128Barcode(context, "~20100393123450000000017", {.x = 8, .y = 20, .height = 32, .barWidth = 0.5});
+    drawing.PrintLine(context, {.x1 = 5, .y1 = 5, .x2 = 90, .y2 = 12, .thickness = 1});
+  };
+  const std::string pdf = DrawnPdf([&](DrawingDevice& device) {
+    device.StartPage(413, 583);
+    draw(device);
     device.EndPage();
   });
-  const std::string picture = testing::Told(pdf, "pdftoppm -r 300 -png \"$document\"");
-  EXPECT_THAT(Scanned(picture), HasSubstr("5901234123457\n"));
-  EXPECT_THAT(Scanned(picture), HasSubstr("00393123450000000017\n"));
+  const std::string printed = testing::Told(pdf, "pdftoppm -r 300 -gray -aaVector no \"$document\"");
+  EXPECT_THAT(printed, StartsWith("P5\n1239 1749\n255\n"));
+  const Picture picture = Drawn(413, 583, draw, 300);
+  // Not EXPECT_EQ, which would print them.
+  EXPECT_TRUE(printed.ends_with(std::string(picture.pixels.begin(), picture.pixels.end())));
+  EXPECT_THAT(Scanned(printed), HasSubstr("5901234123457\n"));
+  EXPECT_THAT(Scanned(printed), HasSubstr("00393123450000000017\n"));
 }
 
 }  // namespace

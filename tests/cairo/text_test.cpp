@@ -9,7 +9,7 @@ namespace {
 
 constexpr TextInks kWhiteOnBlack{.text = Ink::kWhite, .ground = Ink::kBlack};
 
-// On black, where a white ground can be seen.
+// On black, where white ink can be seen.
 Picture OnBlack(std::string_view text, const Font& font, const TextInks& inks = {}) {
   return Drawn(300, 100, [&](DrawingDevice& device) {
     device.Rectangle({0, 50, 300, 51}, 300);
@@ -17,12 +17,12 @@ Picture OnBlack(std::string_view text, const Font& font, const TextInks& inks = 
   });
 }
 
-// The part of the picture that isn't black, as "left top right bottom".
-std::string Ground(const Picture& picture) {
+// The part of the picture that isn't like the paper, as "left top right bottom".
+std::string Drawing(const Picture& picture, int paper) {
   PixelRect box{INT_MAX, INT_MAX, 0, 0};
   for (int y = 0; y < picture.height; ++y) {
     for (int x = 0; x < picture.width; ++x) {
-      if (picture.At(x, y) == 0) continue;
+      if (picture.At(x, y) == paper) continue;
       box = {std::min(box.left, x), std::min(box.top, y), std::max(box.right, x + 1), std::max(box.bottom, y + 1)};
     }
   }
@@ -55,13 +55,19 @@ TEST(CairoTextTest, LiesOnAGroundOfItsLengthAndHeight) {
       {"", {.height = 40, .name = "Arial"}, ""},
       {std::string_view("\0\x01\r\n\x7F\x81\x8D\x8F\x90\x9D", 10), {.height = 40, .name = "Arial"}, ""},
   };
-  for (const auto& test : cases) EXPECT_EQ(Ground(OnBlack(test.text, test.font)), test.ground) << test.text;
+  for (const auto& test : cases) {
+    const Picture picture =
+        Drawn(300, 100, [&](DrawingDevice& device) { device.Text(10, 20, test.text, test.font, kWhiteOnBlack); });
+    EXPECT_EQ(Drawing(picture, 255), test.ground) << test.text;
+  }
+  // The paper's own ground hides nothing.
+  EXPECT_EQ(Drawing(OnBlack("  ", {.height = 50, .name = "Arial"}, {}), 0), "");
 }
 
 TEST(CairoTextTest, IsDrawnInItsInkWithinTheCell) {
   const Font font{.height = 40, .name = "Arial"};
   const Picture white = OnBlack("HIll", font, kWhiteOnBlack);
-  EXPECT_EQ(Ground(white), "12 26 60 52");
+  EXPECT_EQ(Drawing(white, 0), "12 26 60 52");
   EXPECT_GT(std::ranges::count(white.pixels, 255), 250);
   const Picture black = Drawn(300, 100, [&](DrawingDevice& device) { device.Text(10, 20, "HIll", font, {}); });
   EXPECT_NEAR(Darkness(black), 450, 20);
