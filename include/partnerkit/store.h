@@ -82,6 +82,7 @@ std::vector<std::shared_ptr<R>> Select(RecordStore& store, const Lookup& lookup,
 
 struct EDIDoc;
 struct Order;
+struct Pack;
 
 // Which of a partner's counters.
 enum class Counter { kASNNo, kInterchangeNo, kGroupNo };
@@ -110,6 +111,15 @@ class System {
   // store fails, and within BeginTrans, where a number could be taken back.
   virtual std::int32_t NextNumber(std::string_view partnerId, Counter counter) = 0;
 
+  // The packs that wait for a ship notice to the partner, in the order in which they are compiled: packs of one shipment,
+  // order and ship-to stand together. Sub packs go with their lead pack and don't wait. Raises RunTimeError. A host
+  // without ship notices may leave this and the two questions below as they are.
+  virtual std::vector<std::shared_ptr<Pack>> PacksToCompile(std::string_view vendorId, std::string_view partnerId);
+  // Whether everything that was ordered is packed.
+  virtual bool OrderComplete(std::int32_t /*orderId*/) { return false; }
+  // Whether a slip that has packs on the shipment is not packed to its end.
+  virtual bool OrderOpenOnShipment(std::int32_t /*shipmentId*/, std::int32_t /*orderId*/) { return false; }
+
   // A setting of the host, by the names below; nothing for one that isn't set. A host without labels and tickets may
   // leave this as it is. Classes ask at every step, so that a change counts at once.
   virtual std::optional<std::string> Setting(std::string_view /*name*/) { return std::nullopt; }
@@ -136,6 +146,9 @@ class System {
 
   // What the last check of a scan found, see LabelClass::PackLineValid.
   std::int32_t ErrorCode = 0;
+  // The host's own, set by the ship notices: which packs are listed, and running totals that a host may show.
+  std::int32_t PackListMode = 0;
+  std::int32_t CompileTotal1 = 0, CompileTotal2 = 0;
 
  private:
   std::string SettingText(std::string_view name) { return Setting(name).value_or(std::string()); }

@@ -80,6 +80,10 @@ class RowTable {
 
   std::size_t Rows() const { return columns_ == 0 ? 0 : cells_.size() / columns_; }
   std::size_t Columns() const { return columns_; }
+  // Cuts off what stands behind so many rows.
+  void KeepRows(std::size_t rows) {
+    if (rows < Rows()) cells_.resize(rows * columns_);
+  }
   Cell& At(std::size_t row, std::size_t column) { return cells_[row * columns_ + column]; }
   const Cell& At(std::size_t row, std::size_t column) const { return cells_[row * columns_ + column]; }
 

@@ -5,6 +5,7 @@
 #include "labels/label_classes.h"
 #include "orders/csv/csv_classes.h"
 #include "orders/x12/x12_classes.h"
+#include "shipment/csv/csv_notice_classes.h"
 
 namespace partnerkit {
 
@@ -36,6 +37,14 @@ constexpr PublicClass kClasses[] = {
     {"PartnerKit.clsTarget850ansix12",    "Purchase order (850)", "in", "ANSI X12", Make<orders::clsTarget850ansix12>},
     {"PartnerKit.clsGHPL850ansix12",      "Purchase order (850)", "in", "ANSI X12", Make<orders::clsGHPL850ansix12>},
     {"PartnerKit.clsKMart850ansix12",     "Purchase order (850, 860)", "in", "ANSI X12", Make<orders::clsKMart850ansix12>},
+    {"PartnerKit.clsMGB856csv",            "Advance ship notice (856)", "out", "CSV", Make<shipment::clsMGB856csv>},
+    {"PartnerKit.clsTarget856csv",         "Advance ship notice (856)", "out", "CSV", Make<shipment::clsTarget856csv>},
+    {"PartnerKit.clsKMart856csv",          "Advance ship notice (856)", "out", "CSV", Make<shipment::clsKMart856csv>},
+    {"PartnerKit.clsOfficeworks856csv",    "Advance ship notice (856)", "out", "CSV", Make<shipment::clsOfficeworks856csv>},
+    {"PartnerKit.clsMGBBT856csv",          "Advance ship notice (856)", "out", "CSV", Make<shipment::clsMGBBT856csv>},
+    {"PartnerKit.clsCMLFLFDAcsv",          "Advance ship notice (856)", "out", "CSV", Make<shipment::clsCMLFLFDAcsv>},
+    {"PartnerKit.clsMYERDropShipDAcsv",    "Advance ship notice (856)", "out", "CSV", Make<shipment::clsMYERDropShipDAcsv>},
+    {"PartnerKit.clsTargetBulkDAcsv",      "Advance ship notice (856)", "out", "CSV", Make<shipment::clsTargetBulkDAcsv>},
     {"PartnerKit.clsCMLSCM",              "Shipping carton label", "label", "label", {}, MakeLabel<labels::clsCMLSCM>},
 };
 // clang-format on

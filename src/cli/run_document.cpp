@@ -52,6 +52,8 @@ class Run {
       return ask(report, title);
     };
     translator_ = CreateTranslator(definition.ProgId, ports);
+    const PublicClass* const row = FindClass(definition.ProgId);
+    report_.outbound = row != nullptr && row->direction == "out";
     if (!translator_) throw Refusal("document " + document + ": class \"" + definition.ProgId + "\" is not known");
   }
 
@@ -62,7 +64,10 @@ class Run {
   bool Open() {
     const bool bound = translator_->Init(host_, documentId_, report_.columns);
     files_.SetPurpose("listing");
-    if (bound && translator_->Load(file_, report_.rows) > 0) {
+    const std::int32_t rows = bound ? translator_->Load(file_, report_.rows) : 0;
+    if (rows > 0) {
+      // Ship notices hand out room for as many rows as packs wait.
+      report_.rows.KeepRows(static_cast<std::size_t>(rows));
       files_.SetPurpose("");
       return true;
     }

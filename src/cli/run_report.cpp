@@ -1,7 +1,6 @@
 #include "cli/run_report.h"
 
 #include <algorithm>
-#include <array>
 #include <string_view>
 
 #include "cli/json_writer.h"
@@ -63,13 +62,17 @@ void WriteResults(JsonWriter& json, const std::vector<RowResult>& results) {
   json.EndArray();
 }
 
-std::string Told(const RowResult* result) {
-  if (result == nullptr) return {};
-  switch (result->outcome) {
+std::string_view DoneWord(const RunReport& report) { return report.outbound ? "compiled" : "posted"; }
+
+std::string Told(const RunReport& report, const RowResult& result) {
+  const auto withId = [&](std::string_view word) {
+    return std::string(word) + ", id " + std::to_string(std::get<std::int32_t>(result.result));
+  };
+  switch (result.outcome) {
     case Outcome::kPosted:
-      return "posted, id " + std::to_string(std::get<std::int32_t>(result->result));
+      return withId(DoneWord(report));
     case Outcome::kChanged:
-      return "changed, id " + std::to_string(std::get<std::int32_t>(result->result));
+      return withId("changed");
     case Outcome::kCancelled:
       return "cancelled";
     case Outcome::kDeleted:
@@ -87,7 +90,7 @@ void PrintGrid(const Command& command, const RunReport& report, RecordStore& sto
   const auto rowOf = [&](std::size_t line) { return done ? static_cast<std::size_t>(report.results[line].row) : line; };
   const CellText cell = [&](std::size_t line, std::size_t column) {
     if (column == 0) return std::to_string(rowOf(line));
-    if (done && column + 1 == columns.size()) return Told(&report.results[line]);
+    if (done && column + 1 == columns.size()) return Told(report, report.results[line]);
     return CellAsText(report.rows.At(rowOf(line), column - 1));
   };
   NotesBelow notes;
@@ -102,12 +105,12 @@ void PrintGrid(const Command& command, const RunReport& report, RecordStore& sto
 
 void PrintSummary(const Command& command, const RunReport& report) {
   command.out << '\n' << Counted(report.rows.Rows(), "row", "rows");
-  constexpr std::array<std::pair<Outcome, std::string_view>, 5> kOutcomes = {{{Outcome::kPosted, "posted"},
-                                                                              {Outcome::kChanged, "changed"},
-                                                                              {Outcome::kCancelled, "cancelled"},
-                                                                              {Outcome::kDeleted, "deleted"},
-                                                                              {Outcome::kTurnedAway, "not done"}}};
-  for (const auto& [outcome, word] : kOutcomes) {
+  const std::pair<Outcome, std::string_view> outcomes[] = {{Outcome::kPosted, DoneWord(report)},
+                                                           {Outcome::kChanged, "changed"},
+                                                           {Outcome::kCancelled, "cancelled"},
+                                                           {Outcome::kDeleted, "deleted"},
+                                                           {Outcome::kTurnedAway, "not done"}};
+  for (const auto& [outcome, word] : outcomes) {
     const auto count = std::ranges::count(report.results, outcome, &RowResult::outcome);
     if (count > 0) command.out << ", " << count << ' ' << word;
   }

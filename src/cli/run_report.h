@@ -25,6 +25,7 @@ struct RunReport {
   ColumnTable columns;
   RowTable rows;
   bool withResults = false;
+  bool outbound = false;  // a row is compiled, not posted
   std::vector<RowResult> results;
   std::vector<std::int32_t> logIds;  // every log record of the run
 };

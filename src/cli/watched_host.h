@@ -30,6 +30,13 @@ class WatchedHost : public System, private RecordStore {
   std::int32_t NextNumber(std::string_view partnerId, Counter counter) override {
     return host_.NextNumber(partnerId, counter);
   }
+  std::vector<std::shared_ptr<Pack>> PacksToCompile(std::string_view vendorId, std::string_view partnerId) override {
+    return host_.PacksToCompile(vendorId, partnerId);
+  }
+  bool OrderComplete(std::int32_t orderId) override { return host_.OrderComplete(orderId); }
+  bool OrderOpenOnShipment(std::int32_t shipmentId, std::int32_t orderId) override {
+    return host_.OrderOpenOnShipment(shipmentId, orderId);
+  }
   std::optional<std::string> Setting(std::string_view name) override { return host_.Setting(name); }
 
  private:

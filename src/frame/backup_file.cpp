@@ -1,7 +1,7 @@
 #include <algorithm>
-#include <charconv>
 
 #include "frame/line_reader.h"
+#include "frame/note_lines.h"
 #include "frame/work_queue.h"
 
 namespace partnerkit {
@@ -19,39 +19,6 @@ namespace {
 constexpr std::string_view kNoteHead = "partnerkit backup 1";
 constexpr std::string_view kNoteFoot = "end";
 
-// A path on one line: line ends, and the mark itself, as "%" and two digits.
-std::string Escaped(std::string_view path) {
-  std::string escaped;
-  for (const char c : path) {
-    if (c == '%') escaped += "%25";
-    else if (c == '\n') escaped += "%0A";
-    else if (c == '\r') escaped += "%0D";
-    else escaped += c;
-  }
-  return escaped;
-}
-
-std::string Unescaped(std::string_view line) {
-  std::string path;
-  for (std::size_t at = 0; at < line.size(); ++at) {
-    if (line[at] != '%') {
-      path += line[at];
-      continue;
-    }
-    const std::string_view code = line.substr(at + 1, 2);
-    path += code == "0A" ? '\n' : code == "0D" ? '\r' : '%';
-    at += 2;
-  }
-  return path;
-}
-
-std::optional<std::uint64_t> Whole(std::string_view text) {
-  std::uint64_t value = 0;
-  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
-  if (error != std::errc() || end != text.data() + text.size()) return std::nullopt;
-  return value;
-}
-
 }  // namespace
 
 // A note that is not whole was never finished, and then nothing was appended for it either.
@@ -61,18 +28,18 @@ std::optional<BackupFile::Note> BackupFile::ReadNote(InputFile& file) {
   Note note;
   if (!lines.Read(line) || line.text != kNoteHead) return std::nullopt;
   if (!lines.Read(line)) return std::nullopt;
-  const auto base = Whole(line.text);
+  const auto base = WholeNumber(line.text);
   if (!base || !lines.Read(line)) return std::nullopt;
   note.base = *base;
-  note.sourcePath = Unescaped(line.text);
+  note.sourcePath = TextOfNoteLine(line.text);
   if (!lines.Read(line)) return std::nullopt;
   note.sourceIdentity = line.text;
   while (lines.Read(line)) {
     if (line.text == kNoteFoot) return note;
     const std::size_t blank = line.text.find(' ');
     if (blank == std::string_view::npos) return std::nullopt;
-    const auto begin = Whole(line.text.substr(0, blank));
-    const auto end = Whole(line.text.substr(blank + 1));
+    const auto begin = WholeNumber(line.text.substr(0, blank));
+    const auto end = WholeNumber(line.text.substr(blank + 1));
     if (!begin || !end) return std::nullopt;
     note.ranges.push_back({*begin, *end});
   }
@@ -117,7 +84,7 @@ void BackupFile::Settle() {
 void BackupFile::WriteNote(InputFile& source, const std::string& sourcePath, const std::vector<ByteRange>& ranges) {
   const std::string draft = DraftPath();
   const std::unique_ptr<OutputFile> note = files_.OpenOutput(draft, OutputMode::kReplace);
-  note->Write(std::string(kNoteHead) + '\n' + std::to_string(file_->Length()) + '\n' + Escaped(sourcePath) + '\n' +
+  note->Write(std::string(kNoteHead) + '\n' + std::to_string(file_->Length()) + '\n' + NoteLine(sourcePath) + '\n' +
               source.Identity() + '\n');
   for (const ByteRange& range : ranges) {
     note->Write(std::to_string(range.begin) + ' ' + std::to_string(range.end) + '\n');

@@ -1,4 +1,5 @@
 #include "frame/numbers.h"
+#include "partnerkit/records.h"
 #include "partnerkit/run_time_error.h"
 #include "partnerkit/store.h"
 
@@ -7,6 +8,8 @@ namespace partnerkit {
 void System::ComSend(std::string_view) {
   throw RunTimeError(run_time::kDeviceError, "This host has no port for direct labels");
 }
+
+std::vector<std::shared_ptr<Pack>> System::PacksToCompile(std::string_view, std::string_view) { return {}; }
 
 bool System::ComDirect() {
   const std::string set = SettingText("ComDirect");

@@ -48,8 +48,9 @@ class CallLog {
   CallLog(const CallLog&) = delete;
   CallLog& operator=(const CallLog&) = delete;
 
-  void Note(std::int32_t number, std::string_view message) {
-    const std::int32_t id = translator_.WriteLog(number, procedure_, message);
+  void Note(std::int32_t number, std::string_view message) { Note(number, procedure_, message); }
+  void Note(std::int32_t number, std::string_view procedure, std::string_view message) {
+    const std::int32_t id = translator_.WriteLog(number, procedure, message);
     if (id != 0) ids_.push_back(id);
   }
   // What the caller will be shown, for another component to add to.

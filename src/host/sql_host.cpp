@@ -4,6 +4,7 @@
 #include <unistd.h>
 
 #include <array>
+#include <initializer_list>
 #include <limits>
 #include <map>
 
@@ -45,6 +46,18 @@ struct SqlHost::Parts {
     auto& kept = statements[sql];
     if (!kept) kept = std::make_unique<Statement>(session, sql, parameters, columns);
     return *kept;
+  }
+
+  std::int64_t CountOf(const std::string& sql, std::initializer_list<std::int64_t> parameters) {
+    return session.Guarded([&] {
+      Statement& count = Prepared(sql, Kinds(parameters.size(), MemberKind::kLong), {MemberKind::kLong});
+      std::size_t n = 0;
+      for (const std::int64_t parameter : parameters) count.Parameter(n++).Set(parameter);
+      count.Execute();
+      const std::int64_t counted = count.Column(0).whole;
+      count.Reset();
+      return counted;
+    });
   }
 
   SqlSession session;
@@ -161,6 +174,54 @@ std::int32_t SqlHost::NextNumber(std::string_view partnerId, Counter counter) {
     session.RollbackExplicit();
     throw;
   }
+}
+
+std::vector<std::shared_ptr<Pack>> SqlHost::PacksToCompile(std::string_view vendorId, std::string_view partnerId) {
+  return parts_->session.Guarded([&] {
+    std::string columns;
+    Kinds kinds;
+    for (const Member& member : Pack::kType.members) {
+      columns.append(columns.empty() ? "" : ",").append(Quoted(member.name));
+      kinds.push_back(member.kind);
+    }
+    Statement& waiting =
+        parts_->Prepared("SELECT " + columns + " FROM " + Quoted(Pack::kType.table) +
+                             " WHERE \"VendorId\"=:p0 AND \"Status\"<8 AND \"LeadPackId\"=0 AND \"OrderId\" IN (SELECT "
+                             "\"OrderId\" FROM " +
+                             Quoted(Order::kType.table) +
+                             " WHERE \"PartnerId\"=:p1) ORDER BY \"ShipmentId\",\"OrderId\",\"ShipToCode\",\"Id\"",
+                         {MemberKind::kString, MemberKind::kString}, kinds);
+    waiting.Parameter(0).Set(vendorId);
+    waiting.Parameter(1).Set(partnerId);
+    std::vector<std::shared_ptr<Pack>> packs;
+    for (bool more = waiting.Execute(); more; more = waiting.Next()) {
+      Pack& pack = *packs.emplace_back(std::make_shared<Pack>());
+      for (std::size_t n = 0; n < kinds.size(); ++n) waiting.Column(n).CopyTo(Pack::kType.members[n].at(&pack));
+    }
+    waiting.Reset();
+    return packs;
+  });
+}
+
+bool SqlHost::OrderComplete(std::int32_t orderId) {
+  const std::string lines = " FROM \"tbOrderLocnLine\" o WHERE o.\"OrderId\"=:p0";
+  const std::int64_t all = parts_->CountOf("SELECT COUNT(*)" + lines, {orderId});
+  const std::int64_t open = parts_->CountOf(
+      "SELECT COUNT(*)" + lines +
+          " AND o.\"Quantity\">o.\"PackedQty\" AND o.\"Quantity\">COALESCE((SELECT SUM(p.\"Quantity\") FROM "
+          "\"tbPackLine\" "
+          "p JOIN \"tbPSlipLine\" s ON s.\"LineId\"=p.\"PSlipLineId\" WHERE s.\"OrderLocnLineId\"=o.\"Id\"),0)",
+      {orderId});
+  return all > 0 && open == 0;
+}
+
+bool SqlHost::OrderOpenOnShipment(std::int32_t shipmentId, std::int32_t orderId) {
+  return parts_->CountOf(
+             "SELECT COUNT(*) FROM \"tbPSlipLine\" s WHERE s.\"PSlipId\" IN (SELECT \"PSlipId\" FROM \"tbPack\" WHERE "
+             "\"ShipmentId\"=:p0 AND \"OrderId\"=:p1) AND s.\"OrderQty\">s.\"PackedQty\" AND "
+             "s.\"OrderQty\">COALESCE((SELECT "
+             "SUM(p.\"Quantity\") FROM \"tbPackLine\" p WHERE p.\"PSlipLineId\"=s.\"LineId\"),0)",
+             {shipmentId, orderId}) > 0;
 }
 
 std::optional<std::string> SqlHost::Setting(std::string_view name) {

@@ -1,0 +1,50 @@
+// Ship notices to Kmart.
+#include "shipment/csv/csv_notice_classes.h"
+
+namespace partnerkit::shipment {
+
+namespace {
+
+// clang-format off
+constexpr std::string_view kFields[] = {
+    "SUPPLIERNO", "CUSTOMERCODE", "SHIPNOTENO", "SHIPNOTEDATE", "SHIPNOTETIME", "SHIPNOTETYPECODE",
+    "CONSIGNMENTNOTENO", "SHIPMENTWEIGHT", "SCHEDULEDATE", "DELIVERYDATE", "SHIPTOCODE", "SHIPMENTVOLUME", "ORDERNO",
+    "ORDERDATE", "ORDERSTATUSCODE", "POVERSIONNO", "BUYSTORECODE", "INVOICENO", "PACKERID", "PALLETNO",
+    "PALLETMARKTYPE", "PALLETTYPECODE", "CONTAINERNO", "PACKMARKTYPE", "PACKAGETYPECODE", "PACKWEIGHT",
+    "INHOUSEPRODNO", "APN", "QUANTITYSHIPPED", "COST", "LINEREF",
+};
+
+void OrderNo(NoticeRecords& records, std::string& value) {
+  if (Str(records.Order().TypeCode) != "AP") return fill::OrderNoLessRelease(records, value);
+  value = records.Order().PONo + records.Pack().ShipToCode;
+}
+
+void OrderStatus(NoticeRecords& records, std::string& value) {
+  value = !records.Shipment().Complete ? "SS" : records.OrderComplete() ? "CC" : "PR";
+}
+
+constexpr NoticeField kOwn[] = {
+    {"SHIPNOTENO",      Level::kPack, fill::AsnNo2},
+    {"ORDERNO",         Level::kPack, OrderNo},
+    {"ORDERSTATUSCODE", Level::kPack, OrderStatus},
+    {"POVERSIONNO",     Level::kPack, fill::OrderHeader2},
+    {"INVOICENO",       Level::kPack, fill::FirstInvoiceNo},
+    {"PALLETNO",        Level::kPack, fill::PalletNo},
+    {"PACKMARKTYPE",    Level::kPack, [](NoticeRecords&, std::string& v) { v = "GM"; }},
+    {"PACKAGETYPECODE", Level::kPack, fill::ShipPackCode},
+};
+// clang-format on
+
+constexpr CsvNoticeValues kValues{
+    .compile = {.className = "clsKMart856csv", .byShipTo = true},
+    .fields = kFields,
+    .own = kOwn,
+    .mostPacks = 9999,
+    .inventoryLessRelease = true,
+};
+
+}  // namespace
+
+clsKMart856csv::clsKMart856csv(const Ports& ports) : CsvNotice(kValues, ports) {}
+
+}  // namespace partnerkit::shipment

@@ -1,0 +1,43 @@
+// Ship notices to Officeworks.
+#include "shipment/csv/csv_notice_classes.h"
+
+namespace partnerkit::shipment {
+
+namespace {
+
+// clang-format off
+constexpr std::string_view kFields[] = {
+    "SUPPLIERNO", "CUSTOMERCODE", "SHIPNOTENO", "SHIPNOTEDATE", "SHIPNOTETIME", "SHIPNOTETYPECODE",
+    "CONSIGNMENTNOTENO", "SCHEDULEDATE", "DELIVERYDATE", "DATESHIPPED", "SHIPTOCODE", "SHIPMENTVOLUME", "ORDERNO",
+    "ORDERDATE", "PARTNERSUPPLIERNO", "ORDERSTATUSCODE", "POVERSIONNO", "BUYSTORECODE", "INVOICENO", "PACKERID",
+    "PALLETNO", "PALLETMARKTYPE", "PALLETTYPECODE", "CONTAINERNO", "PACKMARKTYPE", "PACKTYPECODE", "PACKWEIGHT",
+    "INHOUSEPRODNO", "APN", "QUANTITYSHIPPED", "COST", "LINEREF",
+};
+
+constexpr NoticeField kOwn[] = {
+    {"SHIPNOTENO",       Level::kPack, fill::AsnNo2},
+    {"SHIPNOTETYPECODE", Level::kPack, [](NoticeRecords&, std::string& v) { v = "9"; }},
+    {"DELIVERYDATE",     Level::kPack, fill::DeliveryDateLong},
+    {"DATESHIPPED",      Level::kPack, fill::ScheduleDateLong},
+    {"ORDERNO",          Level::kPack, fill::OrderNoLessRelease},
+    {"ORDERDATE",        Level::kPack, fill::OrderDateLong},
+    {"ORDERSTATUSCODE",  Level::kPack, [](NoticeRecords& r, std::string& v) { v = r.OrderComplete() ? "164" : "165"; }},
+    {"POVERSIONNO",      Level::kPack, fill::OrderHeader2},
+    {"PALLETNO",         Level::kPack, fill::PalletNo},
+    {"PACKMARKTYPE",     Level::kPack, [](NoticeRecords&, std::string& v) { v = "GM"; }},
+    {"PACKTYPECODE",     Level::kPack, fill::ShipPackCode},
+};
+// clang-format on
+
+constexpr CsvNoticeValues kValues{
+    .compile = {.className = "clsOfficeworks856csv", .byShipTo = true},
+    .fields = kFields,
+    .own = kOwn,
+    .inventoryLessRelease = true,
+};
+
+}  // namespace
+
+clsOfficeworks856csv::clsOfficeworks856csv(const Ports& ports) : CsvNotice(kValues, ports) {}
+
+}  // namespace partnerkit::shipment

@@ -1,0 +1,53 @@
+// Ship notices to Target.
+#include "frame/format.h"
+#include "shipment/csv/csv_notice_classes.h"
+
+namespace partnerkit::shipment {
+
+namespace {
+
+// clang-format off
+constexpr std::string_view kFields[] = {
+    "SUPPLIERNO", "CUSTOMERCODE", "SHIPNOTENO", "SHIPNOTEDATE", "SHIPNOTETIME", "SHIPNOTETYPECODE", "BILLOFLADINGNO",
+    "SHIPMENTWEIGHT", "CONSIGNMENTNOTENO", "BOOKINGNO", "SCHEDULEDATE", "DELIVERYDATE", "DATESHIPPED", "SHIPTOCODE",
+    "SHIPPACKCODE", "ORDERNO", "ORDERSTATUSCODE", "BUYSTORECODE", "DELREFERENCE", "INVOICENO", "PACKERID", "PALLETNO",
+    "PALLETMARKTYPE", "PALLETTYPECODE", "CONTAINERNO", "PACKMARKTYPE", "PACKTYPECODE", "INNERSPERPACK", "PACKLENGTH",
+    "PACKWIDTH", "PACKHEIGHT", "PACKWEIGHT", "INHOUSEPRODNO", "APN", "QUANTITYSHIPPED", "COST", "LINEREF",
+};
+
+constexpr NoticeField kOwn[] = {
+    {"SHIPNOTENO",      Level::kPack, [](NoticeRecords& r, std::string& v) { v = Format(r.Asn().ASNNo, "000000000"); }},
+    {"BILLOFLADINGNO",  Level::kPack, [](NoticeRecords& r, std::string& v) { v = Str(r.Shipment().BillOfLadingNo); }},
+    {"DATESHIPPED",     Level::kPack, fill::ScheduleDate},
+    {"ORDERSTATUSCODE", Level::kPack, [](NoticeRecords& r, std::string& v) { v = r.Shipment().Complete ? "CC" : "SS"; }},
+    {"PALLETNO",        Level::kPack, fill::PalletNo},
+    {"PACKMARKTYPE",    Level::kPack, [](NoticeRecords&, std::string& v) { v = "GM"; }},
+    {"PACKTYPECODE",    Level::kPack, fill::PackageTypeCode},
+};
+// clang-format on
+
+constexpr CsvNoticeValues kValues{
+    .compile = {.className = "clsTarget856csv", .inventoryFailed = "Cannot inventory open file ", .tellsLast = true},
+    .fields = kFields,
+    .own = kOwn,
+    .logsOrder = false,
+    .lines = NoticeLines::kLongRuns,
+    .deliveryDocket = true,
+};
+
+}  // namespace
+
+clsTarget856csv::clsTarget856csv(const Ports& ports) : CsvNotice(kValues, ports) {}
+
+bool clsTarget856csv::WriteNotice(Notice& notice) {
+  Host().CompileTotal1 = Host().CompileTotal2 = 0;
+  return CsvNotice::WriteNotice(notice);
+}
+
+bool clsTarget856csv::FollowOn(Notice& notice) {
+  CsvNotice::FollowOn(notice);
+  if (Str(Document().Options) == "#%TARGETCHINADHL") ProcessChinaDHL(notice);
+  return true;
+}
+
+}  // namespace partnerkit::shipment

@@ -1,0 +1,112 @@
+#include "shipment/notice_records.h"
+
+#include <utility>
+
+namespace partnerkit::shipment {
+
+template <class R>
+bool NoticeRecords::Read(R& record) {
+  return translator_.Try([&] { return Load(translator_.Records(), record); });
+}
+
+template <class R, class K>
+const R& NoticeRecords::Kept(std::unordered_map<K, R>& kept, const K& key, K R::*member) {
+  const auto [entry, isNew] = kept.try_emplace(key);
+  if (isNew && key != K()) {
+    entry->second.*member = key;
+    Read(entry->second);
+  }
+  return entry->second;
+}
+
+void NoticeRecords::SetNotice(const ASN& asn, Text firstInvoiceNo) {
+  asn_ = &asn;
+  firstInvoiceNo_ = std::move(firstInvoiceNo);
+  shipment_ = {};
+  shipment_.Id = asn.ShipmentId;
+  Read(shipment_);
+  order_ = {};
+  order_.OrderId = asn.OrderId;
+  Read(order_);
+  complete_.reset();
+  open_.reset();
+  slips_.clear();
+  jobs_.clear();
+  locns_.clear();
+  orderLines_.clear();
+  types_.clear();
+  products_.clear();
+}
+
+void NoticeRecords::SetPack(const partnerkit::Pack& pack) { pack_ = &pack; }
+
+void NoticeRecords::SetLine(const PackLine& line) {
+  line_ = &line;
+  slipLine_.reset();
+  locnLine_.reset();
+}
+
+bool NoticeRecords::OrderComplete() {
+  if (!complete_) complete_ = translator_.Try([&] { return translator_.Host().OrderComplete(order_.OrderId); });
+  return *complete_;
+}
+
+bool NoticeRecords::OrderOpenOnShipment() {
+  if (!open_) {
+    open_ = translator_.Try([&] { return translator_.Host().OrderOpenOnShipment(shipment_.Id, order_.OrderId); });
+  }
+  return *open_;
+}
+
+const PackType* NoticeRecords::Type() {
+  return pack_->PackTypeId ? &Kept(types_, *pack_->PackTypeId, &PackType::PackTypeId) : nullptr;
+}
+
+std::vector<std::shared_ptr<PackLine>> NoticeRecords::Lines() {
+  PackLine probe;
+  probe.PackId = pack_->Id;
+  return translator_.Try([&] { return Select(translator_.Records(), PackLine::kByPack, probe); });
+}
+
+std::vector<std::shared_ptr<partnerkit::Pack>> NoticeRecords::SubPacks() {
+  partnerkit::Pack probe;
+  probe.LeadPackId = pack_->Id;
+  return translator_.Try([&] { return Select(translator_.Records(), partnerkit::Pack::kByLeadPack, probe); });
+}
+
+const PSlip& NoticeRecords::Slip() { return Kept(slips_, pack_->PSlipId, &PSlip::Id); }
+const Job& NoticeRecords::PackJob() { return Kept(jobs_, Slip().JobId, &Job::JobId); }
+const OrderLocn& NoticeRecords::SlipLocn() { return Kept(locns_, Slip().OrderLocnId, &OrderLocn::LocnId); }
+
+const Product* NoticeRecords::FindProduct(const std::string& number) {
+  const auto [entry, isNew] = products_.try_emplace(number);
+  if (isNew) {
+    Product product;
+    product.ProductNo = number;
+    if (Read(product)) entry->second = std::move(product);
+  }
+  return entry->second ? &*entry->second : nullptr;
+}
+
+const Product* NoticeRecords::LineProduct() { return FindProduct(line_->APN); }
+const Product* NoticeRecords::OrderedProduct() { return FindProduct(OrderedLine().ProductNo); }
+
+const PSlipLine& NoticeRecords::SlipLine() {
+  if (!slipLine_) {
+    slipLine_.emplace().LineId = line_->PSlipLineId;
+    if (line_->PSlipLineId != 0) Read(*slipLine_);
+  }
+  return *slipLine_;
+}
+
+const OrderLocnLine& NoticeRecords::LocnLine() {
+  if (!locnLine_) {
+    locnLine_.emplace().Id = SlipLine().OrderLocnLineId;
+    if (locnLine_->Id != 0) Read(*locnLine_);
+  }
+  return *locnLine_;
+}
+
+const OrderLine& NoticeRecords::OrderedLine() { return Kept(orderLines_, LocnLine().LineId, &OrderLine::LineId); }
+
+}  // namespace partnerkit::shipment
