@@ -74,7 +74,7 @@ class OrderClass:
 
 def order_classes():
     """Every class, in the order of their documents."""
-    classes = [OrderClass(path.parent) for path in SAMPLES.glob("*/*.map")]
+    classes = [OrderClass(path.parent) for path in SAMPLES.glob("*/orders.csv")]
     return sorted(classes, key=lambda each: each.document["EDIDocId"])
 
 

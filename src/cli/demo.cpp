@@ -9,6 +9,7 @@
 #include <sstream>
 #include <vector>
 
+#include "cli/demo_packer.h"
 #include "cli/json_writer.h"
 #include "cli/program.h"
 #include "cli/table.h"
@@ -25,6 +26,7 @@ namespace {
 
 constexpr std::string_view kOrders = "inbox/orders.csv";
 constexpr std::string_view kBackup = "backup/po.csv";
+constexpr std::string_view kNotice = "outbox/cmlda1.csv";
 constexpr std::string_view kAcknowledged = "FA_PO_771_";  // its file's name behind that is the time
 
 // The columns of the order file worth looking at, from 0: transaction, order, store, product, cost, quantity.
@@ -148,17 +150,24 @@ std::vector<Step> OtherPartners() {
   };
 }
 
-// Cartons that are packed and wait for their labels.
-std::vector<Step> Labels() {
+// The way of an order from the file to the notice of its cartons.
+const Step kImportToPack = {"CML's order is to be packed. It is imported like the others:",
+                            {"process", "8", "inbox/cmlflf.csv"},
+                            kTurnedAway};
+
+std::vector<Step> OnTheWay() {
   return {
-      {"CML wants a label on every carton. Three of an order are packed:", {"data", "load", "cartons.json"}, kDone},
-      {"The label printer gets the layout once, and then a job of values for each carton. Without a printer of its own the "
-       "workspace keeps them in spool/:",
-       {"print", "PartnerKit.clsCMLSCM", "--pack", "901", "902", "903"},
+      {"CML wants a label on every carton. The label printer gets the layout once, and then a job of values for each; a "
+       "workspace without printers keeps the jobs in spool/:",
+       {"print", "PartnerKit.clsCMLSCM", "--pack", "1", "2", "3"},
        kDone},
       {"The same label on an ordinary printer, or here as a picture:",
-       {"preview", "PartnerKit.clsCMLSCM", "--pack", "901", "--out", "label.png"},
+       {"preview", "PartnerKit.clsCMLSCM", "--pack", "1", "--out", "label.png"},
        kDone},
+      {"And the ship notice, which tells CML what is on its way. The * is the notice's number:",
+       {"process", "20", "outbox/cmlda*.csv"},
+       kDone,
+       "process 20 'outbox/cmlda*.csv'"},
   };
 }
 
@@ -234,6 +243,32 @@ void TellAcknowledgement(const Command& command) {
   }
 }
 
+void TellPacking(const Command& command) {
+  Command inWorkspace = command;
+  inWorkspace.options.workspace = ".";
+  Workspace workspace(inWorkspace);
+  const PackedOrder packed = PackNewestOrder(workspace.Host(), "CML");
+  workspace.Host().Close();
+  Tell(command, "The warehouse packs it; in this demo a small packer of its own does. Order " + packed.PONo + ":");
+  command.out << '\n';
+  PrintTable(
+      command.out, {{"Pack", true}, {"SSCC"}, {"Holds"}}, packed.cartons.size(),
+      [&](std::size_t row, std::size_t column) {
+        const PackedCarton& carton = packed.cartons[row];
+        if (column == 0) return std::to_string(carton.id);
+        if (column == 1) return carton.sscc;
+        std::string contents;
+        for (const std::string& each : carton.contents) contents += (contents.empty() ? "" : ", ") + each;
+        return contents;
+      },
+      OutputWidth());
+}
+
+void TellNotice(const Command& command) {
+  command.out << "\n$ cat " << kNotice << '\n';
+  for (const std::string& line : LinesOf(kNotice)) command.out << line.substr(0, line.find('\r')) << '\n';
+}
+
 void Talk(const Command& command, Steps& steps, const fs::path& workspace, const std::string& folder) {
   PrintWrapped(command.out,
                "Made the workspace " + workspace.string() +
@@ -247,7 +282,10 @@ void Talk(const Command& command, Steps& steps, const fs::path& workspace, const
   TellFiles(command);
   for (const Step& step : OtherPartners()) TellStep(command, steps, step);
   TellAcknowledgement(command);
-  for (const Step& step : Labels()) TellStep(command, steps, step);
+  TellStep(command, steps, kImportToPack);
+  TellPacking(command);
+  for (const Step& step : OnTheWay()) TellStep(command, steps, step);
+  TellNotice(command);
   Tell(command,
        "To go on with the order of MGB that failed: correct the price in records.json, load it again and run the same "
        "`process` command.");

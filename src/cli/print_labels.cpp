@@ -45,7 +45,9 @@ class LabelRun {
   }
 
   void PrintEach(std::int16_t quantity) {
-    const bool ready = label_->Init(host_, Printer());
+    // Without a carton there is nothing to set a printer up for.
+    const bool any = std::ranges::any_of(packs_, [](const std::optional<Pack>& pack) { return pack.has_value(); });
+    const bool ready = any && label_->Init(host_, Printer());
     for (std::size_t at = 0; at < packs_.size(); ++at) {
       const std::optional<Pack>& pack = packs_[at];
       results_.push_back({order_.packs[at], ready && pack && label_->PrintLabel(*pack, quantity)});
