@@ -120,7 +120,7 @@ class CartonLabel::Run {
       case UserLine::kPacker:
         return "USER ID " + std::string(Str(JobOf(pack).PackerId));
       case UserLine::kJob:
-        return "JOB ID " + std::to_string(JobOf(pack).JobId);
+        return "JOB ID " + JobIdOf(pack);
       case UserLine::kReference:
         return "REFER " + std::string(Str(pack.InvoiceNo));
     }
@@ -150,6 +150,11 @@ class CartonLabel::Run {
     if (Read(slip)) job.JobId = slip.JobId;
     Read(job);
     return job;
+  }
+
+  std::string JobIdOf(const Pack& pack) {
+    const Job job = JobOf(pack);
+    return job.JobId == 0 ? std::string() : std::to_string(job.JobId);
   }
 
   // Of the first item; empty without one.

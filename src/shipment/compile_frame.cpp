@@ -157,20 +157,10 @@ std::int32_t CompileFrame::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog
 }
 
 bool CompileFrame::Compile(Notice& notice) {
-  return Begin(notice) && Prepare(notice) && Number(notice) && OpenOutput(notice) && WriteNotice(notice) &&
-         WriteFiles(notice) && Stamp(notice);
-}
-
-bool CompileFrame::Begin(Notice& notice) {
-  const HandlerOff off(Errors());
-  bool begun = false;
   // Another program may have been interrupted since the listing.
-  for (int attempt = 0; attempt < 2 && !begun; ++attempt) {
-    if (attempt > 0) TakeUpInterrupted("Process");
-    if (!Try([&] { begun = notice.files.Begin(output_); })) break;
-  }
-  if (!begun) notice.log.Note(ErrorNumber(), "Open ASN File", "Cannot open file " + NoticeFiles::NotePath(output_));
-  return begun;
+  TakeUpInterrupted("Process");
+  return Prepare(notice) && Number(notice) && OpenOutput(notice) && WriteNotice(notice) && WriteFiles(notice) &&
+         Stamp(notice);
 }
 
 bool CompileFrame::Prepare(Notice& notice) {
@@ -203,9 +193,18 @@ bool CompileFrame::OpenOutput(Notice& notice) {
     else path += c;
   }
   const HandlerOff off(Errors());
-  if (Try([&] { notice.output = notice.files.Open(path); })) return true;
-  notice.log.Note(ErrorNumber(), "Open ASN File", "Cannot open file " + path);
-  return false;
+  const auto opened = [&](const std::string& name, const auto& open) {
+    bool done = false;
+    if (Try([&] { done = open(); }) && done) return true;
+    notice.log.Note(ErrorNumber(), "Open ASN File", "Cannot open file " + name);
+    return false;
+  };
+  const auto openOutput = [&] {
+    notice.output = notice.files.Open(path);
+    return true;
+  };
+  return opened(path, openOutput) &&
+         opened(NoticeFiles::NotePath(output_), [&] { return notice.files.Begin(output_); });
 }
 
 bool CompileFrame::WriteFiles(Notice& notice) {

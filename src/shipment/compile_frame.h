@@ -91,7 +91,6 @@ class CompileFrame : public TranslatorBase {
   void ListPacks(const PackPointers& packs, RowTable& rows);
   void TakeUpInterrupted(std::string_view procedure);
   bool IsStored(const NoticeId& id);
-  bool Begin(Notice& notice);
   bool WriteFiles(Notice& notice);
   bool Stamp(Notice& notice);
   void StampInTransaction(Notice& notice);

@@ -48,10 +48,10 @@ class NoticeFiles {
   // The note goes.
   void Forget(const std::string& output);
 
-  // Holds the note. False when it tells of an interrupted notice, which is to be dealt with first. Raises RunTimeError,
-  // as does the next, which opens a file for appending and gives its number.
-  bool Begin(const std::string& output);
+  // Opens a file for appending, holds it, and gives its number. Raises RunTimeError, as does the next.
   std::size_t Open(const std::string& path);
+  // Holds the note. False when it tells of an interrupted notice, which is to be dealt with first.
+  bool Begin(const std::string& output);
   // Text for the file of that number; nothing reaches the disk before Write.
   std::string& Text(std::size_t file) { return open_[file].text; }
 

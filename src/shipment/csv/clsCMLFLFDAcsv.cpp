@@ -45,7 +45,7 @@ bool clsCMLFLFDAcsv::Prepare(Notice& notice) {
   return CsvNotice::Prepare(notice);
 }
 
-bool clsCMLFLFDAcsv::CheckPack(Notice& notice, const Pack&) {
+bool clsCMLFLFDAcsv::CheckNotice(Notice& notice) {
   const std::optional<DateTime>& delivery = Values().Shipment().DeliveryDate;
   const std::optional<DateTime>& cancel = Values().Order().CancelAfter;
   if (!delivery || !cancel) {

@@ -92,6 +92,8 @@ bool CsvNotice::Prepare(Notice& notice) {
 }
 
 bool CsvNotice::Number(Notice& notice) {
+  records_.SetNotice(notice.asn, notice.packs.front()->InvoiceNo);
+  if (!CheckNotice(notice)) return false;
   if (values_.mostPacks > 0) {
     Pack probe;
     probe.ShipmentId = notice.asn.ShipmentId;
@@ -111,7 +113,6 @@ bool CsvNotice::OpenOutput(Notice& notice) {
 }
 
 bool CsvNotice::WriteNotice(Notice& notice) {
-  records_.SetNotice(notice.asn, notice.packs.front()->InvoiceNo);
   records_.waitingPacks = WaitingPacks();
   records_.waitingCartons = WaitingCartons();
   records_.linesWritten = 0;
@@ -128,7 +129,7 @@ bool CsvNotice::FillPack(Notice&, const Pack&) {
 
 bool CsvNotice::WritePack(Notice& notice, const Pack& pack) {
   records_.SetPack(pack);
-  if (!CheckPack(notice, pack) || !FillPack(notice, pack)) return false;
+  if (!FillPack(notice, pack)) return false;
   const std::vector<std::shared_ptr<PackLine>> lines = records_.Lines();
   if (lines.empty()) return true;
   std::string told = "......Pack " + std::string(Str(pack.SSCC)) + " added to ConNote " +

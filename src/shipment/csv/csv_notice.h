@@ -51,8 +51,10 @@ class CsvNotice : public CompileFrame {
   bool WriteNotice(Notice& notice) override;
   bool FollowOn(Notice& notice) override;
 
-  // --- The steps of a pack, before anything of it is written. False ends the notice, with the reason noted.
-  virtual bool CheckPack(Notice&, const Pack&) { return true; }
+  // --- Steps of this family. False ends the notice, with the reason noted.
+  // Before it is numbered; its shipment and order are at hand.
+  virtual bool CheckNotice(Notice&) { return true; }
+  // Before anything of the pack is written.
   virtual bool FillPack(Notice& notice, const Pack& pack);
 
   NoticeRecords& Values() { return records_; }

@@ -56,7 +56,7 @@ class clsCMLFLFDAcsv final : public CsvNotice {
 
  private:
   bool Prepare(Notice& notice) override;
-  bool CheckPack(Notice& notice, const Pack& pack) override;
+  bool CheckNotice(Notice& notice) override;
 };
 
 class clsTargetBulkDAcsv final : public CsvNotice {
