@@ -111,9 +111,9 @@ class System {
   // store fails, and within BeginTrans, where a number could be taken back.
   virtual std::int32_t NextNumber(std::string_view partnerId, Counter counter) = 0;
 
-  // The packs that wait for a ship notice to the partner, in the order in which they are compiled: packs of one shipment,
-  // order and ship-to stand together. Sub packs go with their lead pack and don't wait. Raises RunTimeError. A host
-  // without ship notices may leave this and the two questions below as they are.
+  // The packs that wait for a ship notice to the partner, in the order in which they are compiled: packs of one
+  // shipment, order and ship-to stand together. Packs in no shipment don't wait, nor do sub packs, which go with their
+  // lead pack. Raises RunTimeError. A host without ship notices may leave this and the two questions below as they are.
   virtual std::vector<std::shared_ptr<Pack>> PacksToCompile(std::string_view vendorId, std::string_view partnerId);
   // Whether everything that was ordered is packed.
   virtual bool OrderComplete(std::int32_t /*orderId*/) { return false; }

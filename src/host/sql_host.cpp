@@ -186,7 +186,8 @@ std::vector<std::shared_ptr<Pack>> SqlHost::PacksToCompile(std::string_view vend
     }
     Statement& waiting =
         parts_->Prepared("SELECT " + columns + " FROM " + Quoted(Pack::kType.table) +
-                             " WHERE \"VendorId\"=:p0 AND \"Status\"<8 AND \"LeadPackId\"=0 AND \"OrderId\" IN (SELECT "
+                             " WHERE \"VendorId\"=:p0 AND \"Status\"<8 AND \"LeadPackId\"=0 AND \"ShipmentId\"<>0 AND "
+                             "\"OrderId\" IN (SELECT "
                              "\"OrderId\" FROM " +
                              Quoted(Order::kType.table) +
                              " WHERE \"PartnerId\"=:p1) ORDER BY \"ShipmentId\",\"OrderId\",\"ShipToCode\",\"Id\"",
