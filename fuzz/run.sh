@@ -8,7 +8,7 @@ cd "$(dirname "$0")"
 : "${PARTNERKIT_BUILD:?is the build folder}"
 seconds=${1:-60}
 [ $# -eq 0 ] || shift
-[ $# -gt 0 ] || set -- fuzz_segments fuzz_bar_pattern fuzz_csv_orders fuzz_map_file fuzz_x12_orders
+[ $# -gt 0 ] || set -- fuzz_segments fuzz_bar_pattern fuzz_label_packets fuzz_csv_orders fuzz_map_file fuzz_x12_orders
 export PYTHONDONTWRITEBYTECODE=1 PYTHONPATH=../tools
 all='from order_samples import order_classes; from x12_samples import x12_classes
 print(*(each.prog_id for each in order_classes() + x12_classes()))'
@@ -38,6 +38,7 @@ for program in "$@"; do
   case $program in
   fuzz_segments) place=segments ;;
   fuzz_bar_pattern) place=barcodes ;;
+  fuzz_label_packets) place=labels ;;
   *) continue ;;
   esac
   python3 seeds.py "$PARTNERKIT_BUILD/seeds/$place"

@@ -1,9 +1,11 @@
 """Writes the inputs that fuzzing begins with: seeds.py FOLDER for the programs that read no class, seeds.py FOLDER CLASS
-for a class. Order files and maps of odd shapes, made from the samples, and the data of barcodes."""
+for a class. Order files and maps of odd shapes, made from the samples, the data of barcodes, and labels' packets, made
+from the classes' layouts."""
 
 import csv
 import io
 import pathlib
+import re
 import sys
 
 from order_samples import order_class
@@ -109,6 +111,31 @@ def segment_files(classes):
                 yield f"{of_class.name}_{name}", text
 
 
+def label_packets():
+    """A format, a zero byte, a batch."""
+    batch_head = "{B,10,N,1|E,1,0,1,1,0,1|"
+    for layout in sorted(pathlib.Path("../src/labels").glob("*_layout.h")):
+        records = re.findall(r'R"\((.*?)\)"', layout.read_text())
+        header = next((record for record in records if record.startswith(",A,R,E,")), "")
+        fields = [record for record in records if record[:2] in ("T,", "C,", "B,", "L,", "G,")]
+        values = [re.sub("`(.*?)`", r"\1", record) for record in records if record[:1].isdigit()]
+        if not fields:
+            continue
+        head = "{F,10" + header
+        form, batch = head + "".join(fields) + "}", batch_head + "".join(values) + "}"
+        name = layout.stem
+        yield name, form + "\0" + batch
+        yield name + "_halves", form[:len(form) // 2] + "\0" + batch[:len(batch) // 2]
+        yield name + "_twice", form[:-1] + "".join(fields) + "}\0" + batch
+        yield name + "_bars_and_quotes", form + "\0" + batch.replace("Name", 'Na|9,"m"|e')
+        yield name + "_far", re.sub(r",(\d\d\d),", r",39\1,", form) + "\0" + batch
+        yield name + "_white", form.replace(",O,L", ",w,R") + "\0" + batch
+    lines = 'L,S,10,20,30,40,5,"11111111"|L,s,-1,2,3,4.5,0,|L,D,1,2,3,4,5,|G,99,555,320,0,0|X|'
+    bars = "".join(f"B,{number},27,V,182,40,8,{density},152,8,L,0|" for number, density in enumerate("4689", 1))
+    yield "lines_and_bars", (f'{{F,1,A,R,E,300.5,400,"X"|{lines}{bars}C,1,2,0,3,1,1,W,L,0,0,"a, b"|}}\0'
+                             f'{batch_head}1,"~20100093123450000009015"|3,"~2014210363026~201900464"|}}')
+
+
 def write(folder, files):
     folder.mkdir(parents=True, exist_ok=True)
     for name, text in files:
@@ -120,6 +147,7 @@ def main():
     if len(sys.argv) == 2:
         write(folder / "fuzz_segments", segment_files(x12_classes()))
         write(folder / "fuzz_bar_pattern", ((str(number), data) for number, data in enumerate(BARCODES)))
+        write(folder / "fuzz_label_packets", label_packets())
     elif "ansix12" in sys.argv[2]:
         write(folder / "fuzz_x12_orders", x12_files(x12_class(sys.argv[2])))
     else:

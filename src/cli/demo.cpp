@@ -6,6 +6,7 @@
 #include <filesystem>
 #include <fstream>
 #include <iomanip>
+#include <span>
 #include <sstream>
 #include <vector>
 
@@ -31,6 +32,8 @@ constexpr std::string_view kAcknowledged = "FA_PO_771_";  // its file's name beh
 
 // The columns of the order file worth looking at, from 0: transaction, order, store, product, cost, quantity.
 constexpr std::size_t kShownColumns[] = {2, 7, 16, 20, 23, 24};
+// Of the notice: number, consignment, ship-to, order, container, product, trade item, quantity.
+constexpr std::size_t kNoticeColumns[] = {2, 7, 11, 15, 20, 24, 25, 26};
 
 void CopyFiles() {
   fs::create_directory("records");
@@ -50,12 +53,12 @@ std::vector<std::string> LinesOf(const fs::path& path) {
 }
 
 // As `cut -d,` gives them.
-std::string ShownFields(std::string_view line) {
+std::string ShownFields(std::string_view line, std::span<const std::size_t> columns) {
   std::string shown;
   std::size_t column = 0;
   std::istringstream fields{std::string(line)};
   for (std::string field; std::getline(fields, field, ','); ++column) {
-    if (std::ranges::find(kShownColumns, column) != std::end(kShownColumns))
+    if (std::ranges::find(columns, column) != columns.end())
       shown += (shown.empty() ? "" : ",") + field;
   }
   return shown;
@@ -230,7 +233,7 @@ void TellFiles(const Command& command) {
   command.out << "\n$ wc -l " << kOrders << ' ' << kBackup << '\n';
   PrintLineCounts(command.out, {{kOrders, left.size()}, {kBackup, LinesOf(kBackup).size()}});
   command.out << "\n$ cut -d, -f3,8,17,21,24,25 " << kOrders << '\n';
-  for (const std::string& line : left) command.out << ShownFields(line) << '\n';
+  for (const std::string& line : left) command.out << ShownFields(line, kShownColumns) << '\n';
 }
 
 void TellAcknowledgement(const Command& command) {
@@ -265,8 +268,8 @@ void TellPacking(const Command& command) {
 }
 
 void TellNotice(const Command& command) {
-  command.out << "\n$ cat " << kNotice << '\n';
-  for (const std::string& line : LinesOf(kNotice)) command.out << line.substr(0, line.find('\r')) << '\n';
+  command.out << "\n$ cut -d, -f3,8,12,16,21,25-27 " << kNotice << '\n';
+  for (const std::string& line : LinesOf(kNotice)) command.out << ShownFields(line, kNoticeColumns) << '\n';
 }
 
 void Talk(const Command& command, Steps& steps, const fs::path& workspace, const std::string& folder) {

@@ -83,7 +83,17 @@ class LabelRun {
     bool printed;
   };
 
+  // A class that draws says nothing of a printer that isn't there.
   std::string Printer() const {
+    const std::string name = PrinterName();
+    const std::vector<partnerkit::Printer>& known = spooler_.Printers();
+    if (std::ranges::find(known, name, &partnerkit::Printer::Name) == known.end()) {
+      command_.Say("printer " + name + ": no such printer in " + workspace_.Folder().string());
+    }
+    return name;
+  }
+
+  std::string PrinterName() const {
     if (!order_.printer.empty()) return order_.printer;
     std::vector<std::string> named;
     for (const partnerkit::Printer& printer : spooler_.Printers()) {

@@ -58,6 +58,20 @@ char ToWindows1252(char32_t code) {
   return found == kWindows1252.end() ? '?' : static_cast<char>(0x80 + (found - kWindows1252.begin()));
 }
 
+char Capital(char byte) {
+  switch (const unsigned char code = Byte(byte)) {
+    case 0x9A:  // s, oe and z with their marks stand a row above their capitals
+    case 0x9C:
+    case 0x9E:
+      return static_cast<char>(code - 0x10);
+    case 0xFF:
+      return static_cast<char>(0x9F);
+    default:
+      const bool small = (code >= 'a' && code <= 'z') || (code >= 0xE0 && code != 0xF7);
+      return static_cast<char>(small ? code - 0x20 : code);
+  }
+}
+
 }  // namespace
 
 char16_t FromWindows1252(char byte) {
@@ -98,6 +112,12 @@ std::string Windows1252(std::string_view text) {
     at += length;
   }
   return bytes;
+}
+
+std::string Windows1252Capitals(std::string_view bytes) {
+  std::string capitals(bytes);
+  std::ranges::transform(capitals, capitals.begin(), Capital);
+  return capitals;
 }
 
 }  // namespace partnerkit

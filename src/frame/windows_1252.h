@@ -18,4 +18,7 @@ std::string Utf8(std::string_view text);
 // A byte for each character. What is not UTF-8 stands as it is; characters that Windows-1252 doesn't have become "?".
 std::string Windows1252(std::string_view text);
 
+// The capitals of a Windows-1252 text, accented letters included.
+std::string Windows1252Capitals(std::string_view bytes);
+
 }  // namespace partnerkit

@@ -25,6 +25,7 @@ CartonLabel::CartonLabel(const CartonClass& of, const Ports& ports)
       batches_{TextTemplate(batchSources_[0]), TextTemplate(batchSources_[1])} {
   values_.FormatNo = of.formatNo;
   values_.Qty = "1";
+  values_.ComponentItem = values_.ComponentCount = "0";
 }
 
 void CartonLabel::SetUser1(std::string_view text) { values_.User1 = FreeLine(text); }

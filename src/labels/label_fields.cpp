@@ -91,17 +91,17 @@ class Filling {
       number = number.substr(0, release);
     }
     values_.POText = "PO " + Short(number, 22);
-    const std::string_view advertised = Str(Order().Header1);
+    const std::string advertised = Windows1252(Str(Order().Header1));
     const bool dated = advertised.size() > 1;
-    values_.ADDate = dated ? Short(advertised, 4) : std::string();
+    values_.ADDate = dated ? Cut(advertised, 4) : std::string_view();
     values_.ADFlag = dated && advertised.size() > 3 && DecimalOf(advertised) ? "AD" : "";
     values_.DeptText = Short(Str(Order().Header2), 15);
     if (values_.DeptText.empty()) values_.DeptText = Windows1252(Str(Order().DeptNo));
   }
 
   void Capitals() {
-    values_.DeptCapitals = Upper(values_.DeptText);
-    values_.StoreZoneCapitals = Upper(values_.StoreZoneDept);
+    values_.DeptCapitals = Windows1252Capitals(values_.DeptText);
+    values_.StoreZoneCapitals = Windows1252Capitals(values_.StoreZoneDept);
   }
 
  private:

@@ -2,7 +2,7 @@
 
 #include <vector>
 
-#include "frame/format.h"
+#include "frame/windows_1252.h"
 
 namespace partnerkit::labels {
 
@@ -31,7 +31,7 @@ std::vector<std::string_view> LinesOf(std::string_view message) {
 }
 
 std::string Constant(std::string_view prefix, std::string_view line, std::size_t cut) {
-  return std::string(prefix).append("\"").append(Format(line.substr(0, cut), ">")).append("\"|");
+  return std::string(prefix).append("\"").append(Windows1252Capitals(line.substr(0, cut))).append("\"|");
 }
 
 }  // namespace

@@ -10,8 +10,9 @@ namespace {
 
 constexpr int kNormal = 400, kBold = 700;
 
-// Hundredths of an inch as millimetres. An inch counts as 25, as everywhere in a label's drawing.
-double Millimetres(double hundredths) { return hundredths / 100 * 25; }
+// Hundredths of an inch as millimetres. An inch counts as 25, as everywhere in a label's drawing. A quarter is exact,
+// so that 22.5 mm stay a half, to be rounded as one.
+double Millimetres(double hundredths) { return hundredths / 4; }
 
 int Whole(double value) { return ToInteger(value); }
 

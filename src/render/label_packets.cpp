@@ -70,6 +70,7 @@ void ReadBarcode(LabelField& field, const Record& record) {
   field.row = record.Number(5);
   field.col = record.Number(6);
   field.density = record[8];
+  static_cast<void>(record.Number(8));
   field.heightMult = record.Number(9);
 }
 

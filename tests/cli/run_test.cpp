@@ -224,6 +224,10 @@ TEST(Demo, ShowsTheMainJobStepByStep) {
   EXPECT_THAT(ran.out, HasSubstr("2 rows, 2 posted.\n"));
   EXPECT_THAT(ran.out, HasSubstr("5 rows, 3 posted, 1 cancelled, 1 not done.\n"));
   EXPECT_THAT(ran.out, HasSubstr("\nAK1*PO*771\nAK9*A*3*3*3\n"));
+  EXPECT_THAT(ran.out, HasSubstr("   3  093123450000000036  16 x 9312347000201\n"));
+  EXPECT_THAT(ran.out, HasSubstr("\nDrew the label of pack 1: label.png.\n"));
+  EXPECT_THAT(folder.Read("try-it/label.png"), ::testing::StartsWith("\x89PNG"));
+  EXPECT_THAT(ran.out, HasSubstr("\n1,SLH0048213,2500,90021,093123450000000036,TEA-60,19312347000208,16\n"));
   std::istringstream lines(ran.out);
   for (std::string line; std::getline(lines, line);) {
     EXPECT_TRUE(line.size() <= 100 || line.starts_with("ISA*")) << line;

@@ -58,6 +58,21 @@ TEST_F(FolderTest, NumbersGoOnFromTheHighestOfEitherKind) {
   EXPECT_EQ(Names().size(), 12U);
 }
 
+TEST_F(FolderTest, NumbersGoOnBehindTheFilesOfAnotherProgram) {
+  const auto destination = MakeFolder(folder / "", kShort);
+  const auto deliver = [&] { return fs::path(destination->Deliver("job", Content::kRaw, "job")).filename(); };
+  EXPECT_EQ(deliver(), "0001.prn");
+  EXPECT_EQ(deliver(), "0002.prn");
+  folder.Write("0003.prn", "another's");
+  EXPECT_EQ(deliver(), "0004.prn");
+  folder.Write("0040.pdf", "another's");
+  EXPECT_EQ(deliver(), "0041.prn");
+  fs::remove(folder / "0041.prn");
+  EXPECT_EQ(deliver(), "0041.prn");
+  EXPECT_EQ(folder.Read("0003.prn"), "another's");
+  EXPECT_EQ(Names().size(), 6U);
+}
+
 TEST_F(FolderTest, ProgramsThatSpoolAtOnceShareTheNumbers) {
   constexpr int kPrograms = 4, kJobs = 25;
   for (int program = 0; program < kPrograms; ++program) {
