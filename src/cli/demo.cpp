@@ -58,8 +58,7 @@ std::string ShownFields(std::string_view line, std::span<const std::size_t> colu
   std::size_t column = 0;
   std::istringstream fields{std::string(line)};
   for (std::string field; std::getline(fields, field, ','); ++column) {
-    if (std::ranges::find(columns, column) != columns.end())
-      shown += (shown.empty() ? "" : ",") + field;
+    if (std::ranges::find(columns, column) != columns.end()) shown += (shown.empty() ? "" : ",") + field;
   }
   return shown;
 }
@@ -154,13 +153,13 @@ std::vector<Step> OtherPartners() {
 }
 
 // The way of an order from the file to the notice of its cartons.
-const Step kImportToPack = {"CML's order is to be packed. It is imported like the others:",
-                            {"process", "8", "inbox/cmlflf.csv"},
-                            kTurnedAway};
+const Step kImportToPack = {
+    "CML's order is to be packed. It is imported like the others:", {"process", "8", "inbox/cmlflf.csv"}, kTurnedAway};
 
 std::vector<Step> OnTheWay() {
   return {
-      {"CML wants a label on every carton. The label printer gets the layout once, and then a job of values for each; a "
+      {"CML wants a label on every carton. The label printer gets the layout once, and then a job of values for each; "
+       "a "
        "workspace without printers keeps the jobs in spool/:",
        {"print", "PartnerKit.clsCMLSCM", "--pack", "1", "2", "3"},
        kDone},

@@ -43,7 +43,8 @@ class SqlHost : public System {
   std::vector<EDIDoc> EDIDocList() override;
   std::int32_t NextNumber(std::string_view partnerId, Counter counter) override;
   std::vector<std::shared_ptr<Pack>> PacksToCompile(std::string_view vendorId, std::string_view partnerId) override;
-  // By what is packed: the quantity noted on the order's or slip's line, or the sum of its pack lines, whichever is more.
+  // By what is packed: the quantity noted on the order's or slip's line, or the sum of its pack lines, whichever is
+  // more.
   bool OrderComplete(std::int32_t orderId) override;
   bool OrderOpenOnShipment(std::int32_t shipmentId, std::int32_t orderId) override;
 
