@@ -55,8 +55,10 @@ bool CartonLabel::Init(System& system, const std::string& aPrinter) {
 bool CartonLabel::PrintLabel(const Pack& aPack, std::optional<std::int16_t> Qty, bool ComDirect) {
   return Printing("Function PrintLabel", [&](bool& printed) {
     values_.Qty = std::to_string(Qty.value_or(1));
-    const bool inHand = ComDirect || HasPort();
-    if (!inHand && !job_.Open(printer_, Language() == kWinPCL)) return;
+    // A port can't be drawn on.
+    const bool drawn = Language() == kWinPCL;
+    const bool inHand = ComDirect || (HasPort() && !drawn);
+    if (!inHand && !job_.Open(printer_, drawn)) return;
     FillValues(aPack);
     printed = WriteLabel();
   });

@@ -124,7 +124,7 @@ TEST_F(BatchTest, TheSettingSaysWhatTheSecondFreeLineShows) {
   for (const auto& [field, line] : {std::pair("STYLE", "ITEM ID "),
                                     {"APN", "ITEM ID "},
                                     {"USER", "USER ID "},
-                                    {"JOB", "JOB ID 0"},
+                                    {"JOB", "JOB ID "},
                                     {"DESC", "ITEM ID "},
                                     {"DELIVERYREF", "REFER "}}) {
     trade.Set({{"LabelUserField", field}});

@@ -40,6 +40,7 @@ const Road kRoads[] = {
     {"ZPL",    "",     "",     false, {},             {"dock ^XA^M"}},
     {"ZPL",    "1",    "COM1", false, {},             {"COM1 ^XA^M"}, 0},
     {"WinPCL", "",     "",     false, {},             {"dock page "}},
+    {"WinPCL", "1",    "COM1", false, {},             {"dock page "}},
     {"WinPCL", "",     "",     true,  {},             {}, 0, {},
      "(No print job is open) occured in module cCMLSCM, Sub PrintWinPCL,"},
     {"LBX",    "",     "",     false, {"dock {F,10"}, {}, 1, {"0 WriteLabel: LBX unknown."}},
