@@ -45,7 +45,7 @@ constexpr PublicClass kClasses[] = {
     {"PartnerKit.clsCMLFLFDAcsv",          "Advance ship notice (856)", "out", "CSV", Make<shipment::clsCMLFLFDAcsv>},
     {"PartnerKit.clsMYERDropShipDAcsv",    "Advance ship notice (856)", "out", "CSV", Make<shipment::clsMYERDropShipDAcsv>},
     {"PartnerKit.clsTargetBulkDAcsv",      "Advance ship notice (856)", "out", "CSV", Make<shipment::clsTargetBulkDAcsv>},
-    {"PartnerKit.clsCMLSCM",              "Shipping carton label", "label", "label", {}, MakeLabel<labels::clsCMLSCM>},
+    {"PartnerKit.clsCMLSCM",              "Shipping carton label", "label", "LBXII, ZPL, WinPCL", {}, MakeLabel<labels::clsCMLSCM>},
 };
 // clang-format on
 
