@@ -85,7 +85,7 @@ class LabelRun {
 
   // A class that draws says nothing of a printer that isn't there.
   std::string Printer() const {
-    const std::string name = PrinterName();
+    std::string name = PrinterName();
     const std::vector<partnerkit::Printer>& known = spooler_.Printers();
     if (std::ranges::find(known, name, &partnerkit::Printer::Name) == known.end()) {
       command_.Say("printer " + name + ": no such printer in " + workspace_.Folder().string());
