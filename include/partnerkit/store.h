@@ -119,6 +119,9 @@ class System {
   virtual bool OrderComplete(std::int32_t /*orderId*/) { return false; }
   // Whether a slip that has packs on the shipment is not packed to its end.
   virtual bool OrderOpenOnShipment(std::int32_t /*shipmentId*/, std::int32_t /*orderId*/) { return false; }
+  // Stamps a waiting pack as compiled into the stored notice: `ASNId`, and 8 as its `Status`. False, and nothing is
+  // done, when it waits no longer. Raises RunTimeError.
+  virtual bool StampPack(std::int32_t packId, std::int32_t noticeId);
 
   // A setting of the host, by the names below; nothing for one that isn't set. A host without labels and tickets may
   // leave this as it is. Classes ask at every step, so that a change counts at once.

@@ -23,9 +23,15 @@ class WatchedHost : public System, private RecordStore {
   std::string UserId() override { return host_.UserId(); }
   bool DeleteOrder(const Order& order) override;
   void Commit(std::int32_t mode) override { host_.Commit(mode); }
-  void BeginTrans() override { host_.BeginTrans(); }
+  void BeginTrans() override {
+    host_.BeginTrans();
+    logIdsBefore_ = logIds_.size();
+  }
   void CommitTrans() override { host_.CommitTrans(); }
-  void RollbackTrans() override { host_.RollbackTrans(); }
+  void RollbackTrans() override {
+    host_.RollbackTrans();
+    if (logIds_.size() > logIdsBefore_) logIds_.resize(logIdsBefore_);
+  }
   std::vector<EDIDoc> EDIDocList() override { return host_.EDIDocList(); }
   std::int32_t NextNumber(std::string_view partnerId, Counter counter) override {
     return host_.NextNumber(partnerId, counter);
@@ -37,6 +43,7 @@ class WatchedHost : public System, private RecordStore {
   bool OrderOpenOnShipment(std::int32_t shipmentId, std::int32_t orderId) override {
     return host_.OrderOpenOnShipment(shipmentId, orderId);
   }
+  bool StampPack(std::int32_t packId, std::int32_t noticeId) override { return host_.StampPack(packId, noticeId); }
   std::optional<std::string> Setting(std::string_view name) override { return host_.Setting(name); }
 
  private:
@@ -59,6 +66,7 @@ class WatchedHost : public System, private RecordStore {
   host::SqlHost& host_;
   RecordStore& records_;
   std::vector<std::int32_t> logIds_;
+  std::size_t logIdsBefore_ = 0;  // the transaction
   std::int32_t ordersDeleted_ = 0;
 };
 

@@ -225,6 +225,20 @@ bool SqlHost::OrderOpenOnShipment(std::int32_t shipmentId, std::int32_t orderId)
              {shipmentId, orderId}) > 0;
 }
 
+// Only what changes is written: a pack is in many indexes.
+bool SqlHost::StampPack(std::int32_t packId, std::int32_t noticeId) {
+  return parts_->session.Guarded([&] {
+    parts_->session.EnsureWriting();
+    Statement& stamp = parts_->Prepared(
+        "UPDATE " + Quoted(Pack::kType.table) + " SET \"ASNId\"=:p0,\"Status\"=8 WHERE \"Id\"=:p1 AND \"Status\"<8",
+        {MemberKind::kInt, MemberKind::kInt}, {});
+    stamp.Parameter(0).Set(std::int64_t{noticeId});
+    stamp.Parameter(1).Set(std::int64_t{packId});
+    stamp.Execute();
+    return stamp.RowsChanged() > 0;
+  });
+}
+
 std::optional<std::string> SqlHost::Setting(std::string_view name) {
   // Every log record and every label asks for some.
   const auto kept = parts_->settings.find(name);

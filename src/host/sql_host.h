@@ -47,6 +47,7 @@ class SqlHost : public System {
   // more.
   bool OrderComplete(std::int32_t orderId) override;
   bool OrderOpenOnShipment(std::int32_t shipmentId, std::int32_t orderId) override;
+  bool StampPack(std::int32_t packId, std::int32_t noticeId) override;
 
   // Raises RunTimeError when the database cannot be written to, or is locked by another program beyond the time-out.
   void CheckWritable();

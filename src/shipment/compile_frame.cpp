@@ -50,7 +50,11 @@ std::int32_t CompileFrame::Load(const std::string& a_sFileName, RowTable& a_vtRo
     inventoryPath_ = Str(TradingPartner().InventoryFile);
     inventoryOn_ = inventoryPath_.size() > 1 && extension == kInventoryOption;
     output_ = a_sFileName;
-    TakeUpInterrupted("Load");
+    rows_.clear();
+    waiting_.clear();
+    const auto tell = [&](std::string_view told) { WriteLog(kWarning, "Load", told); };
+    TakeUpInterrupted(output_, tell);
+    if (inventoryOn_) TakeUpInterrupted(inventoryPath_, tell);
     Host().PackListMode = 0;
     const PackPointers packs = Try([&] { return Host().PacksToCompile(Document().VendorId, Document().PartnerId); });
     if (packs.empty()) {
@@ -68,8 +72,6 @@ CompileFrame::RowKey CompileFrame::KeyOf(const Pack& pack) const {
 
 // Neighbours are compared: packs of one row stand together.
 void CompileFrame::ListPacks(const PackPointers& packs, RowTable& rows) {
-  rows_.clear();
-  waiting_.clear();
   waitingPacks_ = packs.size();
   waitingCartons_ = 0;
   rows = RowTable(packs.size(), Columns().size());
@@ -117,26 +119,25 @@ ASN CompileFrame::AsnOf(const Pack& pack) {
 }
 
 // A run that was killed while it wrote a notice left a note. Once the notice is stored, that is all there is to it;
-// else it goes from the files, for its packs still wait.
-void CompileFrame::TakeUpInterrupted(std::string_view procedure) {
+// else it goes from the file, for its packs still wait. The note stays when that can't be told or done.
+void CompileFrame::TakeUpInterrupted(const std::string& name, const std::function<void(std::string_view)>& tell) {
   NoticeFiles files(FileSystem());
-  const auto pending = Try([&] { return files.FindPending(output_); });
+  const auto pending = Try([&] { return files.FindPending(name); });
   if (!pending) return;
-  if (!pending->files.empty() && !IsStored(pending->id)) {
-    for (const std::string& path : Try([&] { return files.TakeBack(*pending); })) {
-      WriteLog(kWarning, procedure,
-               "Notice " + pending->id.ASNNo + " of an interrupted run was never stored and is taken out of " + path);
-    }
-  }
-  Try([&] { files.Forget(output_); });
+  const bool dealtWith = Try([&] {
+    if (pending->path.empty() || IsStored(pending->id) || !files.TakeBack(*pending)) return;
+    tell("Notice " + pending->id.ASNNo + " of an interrupted run was never stored and is taken out of " +
+         pending->path);
+  });
+  if (dealtWith) Try([&] { files.Forget(name); });
 }
 
+// Whoever the partner: several documents may write to one file.
 bool CompileFrame::IsStored(const NoticeId& id) {
   ASN probe;
   probe.ShipmentId = id.shipmentId;
-  const auto stored = Try([&] { return Select(Records(), ASN::kByShipment, probe); });
-  return std::ranges::any_of(stored, [&](const auto& asn) {
-    return asn->OrderId == id.orderId && Str(asn->ASNNo) == id.ASNNo && asn->PartnerId == Document().PartnerId;
+  return std::ranges::any_of(Select(Records(), ASN::kByShipment, probe), [&](const auto& asn) {
+    return asn->OrderId == id.orderId && Str(asn->ASNNo) == id.ASNNo;
   });
 }
 
@@ -148,7 +149,14 @@ std::int32_t CompileFrame::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog
     const RowKey key{notice.asn.ShipmentId, notice.asn.OrderId, std::string(Str(notice.asn.ShipToCode))};
     if (const auto waiting = waiting_.find(key); waiting != waiting_.end()) notice.packs = waiting->second;
     if (notice.packs.empty()) return notice.log.Note(kRejection, "No Packs found to process.");
-    if (!Compile(notice)) return;
+    bool compiled = false;
+    try {
+      compiled = Compile(notice);
+    } catch (...) {
+      LogPacks(notice);
+      throw;
+    }
+    if (!compiled) return;
     TakeOut(key);
     RunCarrier(notice);
     if (RunExtension(notice) && FollowOn(notice)) id = notice.asn.Id;
@@ -157,18 +165,45 @@ std::int32_t CompileFrame::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog
 }
 
 bool CompileFrame::Compile(Notice& notice) {
-  // Another program may have been interrupted since the listing.
-  TakeUpInterrupted("Process");
-  return Prepare(notice) && Number(notice) && OpenOutput(notice) && WriteNotice(notice) && WriteFiles(notice) &&
+  return Prepare(notice) && Number(notice) && OpenOutput(notice) && MakeNotice(notice) && WriteFiles(notice) &&
          Stamp(notice);
+}
+
+// Of one state of the store. Hundreds of reads that each ask for it by themselves cost a store noticeably more, too.
+bool CompileFrame::MakeNotice(Notice& notice) {
+  const bool begun = Try([&] { Host().BeginTrans(); });
+  try {
+    const bool made = WriteNotice(notice);
+    if (begun) Try([&] { Host().CommitTrans(); });
+    return made;
+  } catch (...) {
+    if (begun) Try([&] { Host().RollbackTrans(); });
+    throw;
+  }
+}
+
+// The file's number among the notice's files; nothing, with the cause in ErrorNumber, when it can't be opened.
+std::optional<std::size_t> CompileFrame::OpenFile(Notice& notice, const std::string& name, const std::string& path) {
+  bool begun = false;
+  // Another program may have been interrupted since the listing.
+  for (int attempt = 0; attempt < 2 && !begun; ++attempt) {
+    if (attempt > 0) TakeUpInterrupted(name, [&](std::string_view told) { notice.log.Note(kWarning, told); });
+    if (!Try([&] { begun = notice.files.Begin(name); })) return std::nullopt;
+  }
+  if (!begun) return std::nullopt;
+  return Try([&] { return std::optional(notice.files.Open(path)); });
 }
 
 bool CompileFrame::Prepare(Notice& notice) {
   if (!inventoryOn_) return true;
   const HandlerOff off(Errors());
-  if (Try([&] { notice.inventory = notice.files.Open(inventoryPath_); })) return true;
-  notice.log.Note(ErrorNumber(), "Open Inventory File", std::string(compile_.inventoryFailed) + inventoryPath_);
-  return false;
+  const auto file = OpenFile(notice, inventoryPath_, inventoryPath_);
+  if (!file) {
+    notice.log.Note(ErrorNumber(), "Open Inventory File", std::string(compile_.inventoryFailed) + inventoryPath_);
+    return false;
+  }
+  notice.inventory = *file;
+  return true;
 }
 
 bool CompileFrame::Number(Notice& notice) { return NumberFrom(notice, *notice.packs.front()); }
@@ -193,18 +228,13 @@ bool CompileFrame::OpenOutput(Notice& notice) {
     else path += c;
   }
   const HandlerOff off(Errors());
-  const auto opened = [&](const std::string& name, const auto& open) {
-    bool done = false;
-    if (Try([&] { done = open(); }) && done) return true;
-    notice.log.Note(ErrorNumber(), "Open ASN File", "Cannot open file " + name);
+  const auto file = OpenFile(notice, output_, path);
+  if (!file) {
+    notice.log.Note(ErrorNumber(), "Open ASN File", "Cannot open file " + path);
     return false;
-  };
-  const auto openOutput = [&] {
-    notice.output = notice.files.Open(path);
-    return true;
-  };
-  return opened(path, openOutput) &&
-         opened(NoticeFiles::NotePath(output_), [&] { return notice.files.Begin(output_); });
+  }
+  notice.output = *file;
+  return true;
 }
 
 bool CompileFrame::WriteFiles(Notice& notice) {
@@ -212,6 +242,7 @@ bool CompileFrame::WriteFiles(Notice& notice) {
     notice.files.Write({*notice.asn.ASNNo, notice.asn.ShipmentId, notice.asn.OrderId});
     return true;
   } catch (const RunTimeError& error) {
+    LogPacks(notice);
     notice.log.Note(error.Number(), "Process", "Cannot write ASN " + *notice.asn.ASNNo + ": " + error.Description());
     return false;
   }
@@ -228,28 +259,27 @@ bool CompileFrame::Stamp(Notice& notice) {
     notice.log.Ids().resize(told);
     notice.asn.Id = 0;
     notice.files.Abandon();
+    LogPacks(notice);
     notice.log.Note(error.Number(), "Process",
                     "ASN " + *notice.asn.ASNNo +
                         " was written but not stored, and is taken out of its files again: " + error.Description());
     return false;
   }
-  Try([&] { notice.files.Settle(); });
+  notice.packsTold.clear();
+  for (const auto& pack : notice.packs) {
+    pack->ASNId = notice.asn.Id;
+    pack->Status = kCompiled;
+  }
+  notice.files.Settle();
   return true;
 }
 
 // A pack may have been compiled by another program since it was listed.
 void CompileFrame::StampInTransaction(Notice& notice) {
   if (!Add(Records(), notice.asn)) RaiseStore(*this, "The notice cannot be stored");
-  for (const auto& listed : notice.packs) {
-    Pack pack;
-    pack.Id = listed->Id;
-    if (!partnerkit::Load(Records(), pack) || pack.Status >= kCompiled) {
-      throw RunTimeError(run_time::kInvalidCall, "Pack " + std::string(Str(listed->SSCC)) + " no longer waits");
-    }
-    pack.ASNId = notice.asn.Id;
-    pack.Status = kCompiled;
-    if (!Update(Records(), pack)) RaiseStore(*this, "A pack cannot be stamped");
-    *listed = std::move(pack);
+  for (const auto& pack : notice.packs) {
+    if (Host().StampPack(pack->Id, notice.asn.Id)) continue;
+    throw RunTimeError(run_time::kInvalidCall, "Pack " + std::string(Str(pack->SSCC)) + " no longer waits");
   }
   Shipment shipment;
   shipment.Id = notice.asn.ShipmentId;
@@ -257,8 +287,18 @@ void CompileFrame::StampInTransaction(Notice& notice) {
     shipment.Status = kCompiled;
     if (!Update(Records(), shipment)) RaiseStore(*this, "The shipment cannot be stamped");
   }
+  LogEach(notice);
   if (!compile_.tellsLast) TellCompiled(notice);
   Host().CommitTrans();
+}
+
+void CompileFrame::LogEach(Notice& notice) {
+  for (const std::string& told : notice.packsTold) notice.log.Note(kInformation, "Process Pack", told);
+}
+
+void CompileFrame::LogPacks(Notice& notice) {
+  LogEach(notice);
+  notice.packsTold.clear();
 }
 
 void CompileFrame::TellCompiled(Notice& notice) {

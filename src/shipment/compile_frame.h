@@ -7,8 +7,10 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <tuple>
@@ -57,6 +59,7 @@ class CompileFrame : public TranslatorBase {
     CallLog log;
     NoticeFiles files;
     std::size_t output = 0, inventory = 0;  // their numbers in `files`
+    std::vector<std::string> packsTold;     // what is still to be logged of the packs
   };
 
   // --- The steps of a row, in their order. False ends it, with the reason noted.
@@ -69,6 +72,8 @@ class CompileFrame : public TranslatorBase {
   virtual bool FollowOn(Notice&) { return true; }
 
   // --- What the steps are made of
+  // Logs the packs told so far. They wait for the stamping, so that one wait for the disk does for both.
+  void LogPacks(Notice& notice);
   // The pack's invoice number if the partner's notices bear it, else the next number of the partner's.
   bool NumberFrom(Notice& notice, const Pack& first);
   // Papers that this version doesn't make yet: the notice stands, and its row says so.
@@ -89,11 +94,15 @@ class CompileFrame : public TranslatorBase {
   RowKey KeyOf(const Pack& pack) const;
   ASN AsnOf(const Pack& pack);
   void ListPacks(const PackPointers& packs, RowTable& rows);
-  void TakeUpInterrupted(std::string_view procedure);
+  // `name` is a file's as it is configured, with its "*".
+  void TakeUpInterrupted(const std::string& name, const std::function<void(std::string_view)>& tell);
+  std::optional<std::size_t> OpenFile(Notice& notice, const std::string& name, const std::string& path);
   bool IsStored(const NoticeId& id);
+  bool MakeNotice(Notice& notice);
   bool WriteFiles(Notice& notice);
   bool Stamp(Notice& notice);
   void StampInTransaction(Notice& notice);
+  void LogEach(Notice& notice);
   void TellCompiled(Notice& notice);
   void TakeOut(const RowKey& key);
   void RunCarrier(Notice& notice);

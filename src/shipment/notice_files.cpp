@@ -12,36 +12,51 @@ namespace {
 
 constexpr std::string_view kHead = "partnerkit notice 1";
 constexpr std::string_view kFoot = "end";
+// Whether the file was there before.
+constexpr std::string_view kNew = "new";
+constexpr std::string_view kGrown = "grown";
 
-// "base added path"
-std::optional<NoticeFiles::Pending::File> ReadFile(std::string_view line) {
-  const std::size_t first = line.find(' ');
-  const std::size_t second = first == std::string_view::npos ? first : line.find(' ', first + 1);
-  if (second == std::string_view::npos) return std::nullopt;
-  const auto base = WholeNumber(line.substr(0, first));
-  const auto added = WholeNumber(line.substr(first + 1, second - first - 1));
-  if (!base || !added) return std::nullopt;
-  return NoticeFiles::Pending::File{TextOfNoteLine(line.substr(second + 1)), *base, *added};
+template <class T>
+bool ReadNumber(LineReader& lines, T& number) {
+  Line line;
+  const auto read = lines.Read(line) ? WholeNumber(line.text) : std::nullopt;
+  if (read) number = static_cast<T>(*read);
+  return read.has_value();
 }
 
-// False for a note that is not whole: it was never finished, and then nothing was added for it either.
-bool ReadNote(InputFile& file, NoticeFiles::Pending& pending) {
-  LineReader lines(file);
+// The file's name and whether it is new. Without both, the file was not touched yet.
+bool ReadHead(LineReader& lines, NoticeFiles::Pending& pending, bool& isNew) {
   Line line;
   if (!lines.Read(line) || line.text != kHead || !lines.Read(line)) return false;
+  pending.path = TextOfNoteLine(line.text);
+  if (!lines.Read(line) || (line.text != kNew && line.text != kGrown)) return false;
+  isNew = line.text == kNew;
+  return true;
+}
+
+// Without all of it, nothing was written to the file yet.
+bool ReadRest(LineReader& lines, NoticeFiles::Pending& pending) {
+  Line line;
+  if (!lines.Read(line)) return false;
   pending.id.ASNNo = TextOfNoteLine(line.text);
-  for (std::int32_t* id : {&pending.id.shipmentId, &pending.id.orderId}) {
-    const auto number = lines.Read(line) ? WholeNumber(line.text) : std::nullopt;
-    if (!number) return false;
-    *id = static_cast<std::int32_t>(*number);
+  return ReadNumber(lines, pending.id.shipmentId) && ReadNumber(lines, pending.id.orderId) &&
+         ReadNumber(lines, pending.base) && ReadNumber(lines, pending.added) && lines.Read(line) && line.text == kFoot;
+}
+
+void ReadNote(NoticeFiles::Pending& pending) {
+  LineReader lines(*pending.note);
+  bool isNew = false;
+  if (!ReadHead(lines, pending, isNew)) {
+    pending.path.clear();
+  } else if (!ReadRest(lines, pending)) {
+    pending.id = {};
+    pending.base = pending.added = 0;
+    if (!isNew) pending.path.clear();
   }
-  while (lines.Read(line)) {
-    if (line.text == kFoot) return true;
-    const auto entry = ReadFile(line.text);
-    if (!entry) return false;
-    pending.files.push_back(*entry);
-  }
-  return false;
+}
+
+std::string NoteHead(const std::string& path, bool isNew) {
+  return std::string(kHead) + '\n' + NoteLine(path) + '\n' + std::string(isNew ? kNew : kGrown) + '\n';
 }
 
 template <class F>
@@ -49,78 +64,98 @@ void Ignoring(F operation) {
   try {
     operation();
   } catch (const RunTimeError&) {
-    // On the way out of another failure; the note that stays tells the next run.
+    // The files are on the disk, or another failure is on its way out. A note that stays tells the next run.
   }
 }
 
 }  // namespace
 
-std::string NoticeFiles::NotePath(std::string output) {
-  std::ranges::replace(output, '*', '_');
-  return output + ".pending";
+std::string NoticeFiles::NotePath(std::string name) {
+  std::ranges::replace(name, '*', '_');
+  return name + ".pending";
 }
 
-std::optional<NoticeFiles::Pending> NoticeFiles::FindPending(const std::string& output) {
-  const std::string path = NotePath(output);
+std::optional<NoticeFiles::Pending> NoticeFiles::FindPending(const std::string& name) {
+  const std::string path = NotePath(name);
   if (!files_.Exists(path)) return std::nullopt;
   Pending pending;
   try {
     pending.note = files_.OpenInput(path, Share::kExclusive);
-    if (!ReadNote(*pending.note, pending)) pending.files.clear();
+    ReadNote(pending);
   } catch (const RunTimeError&) {
     return std::nullopt;
   }
   return pending;
 }
 
-std::vector<std::string> NoticeFiles::TakeBack(const Pending& pending) {
-  std::vector<std::string> cut;
-  for (const Pending::File& each : pending.files) {
-    if (!files_.Exists(each.path)) continue;
-    const std::unique_ptr<OutputFile> file = files_.OpenOutput(each.path, OutputMode::kAppend);
-    const std::uint64_t length = file->Length();
-    if (length <= each.base || length > each.base + each.added) continue;
-    file->Truncate(each.base);
+bool NoticeFiles::TakeBack(const Pending& pending) {
+  if (!files_.Exists(pending.path)) return false;
+  const std::unique_ptr<OutputFile> file = files_.OpenOutput(pending.path, OutputMode::kAppend);
+  const std::uint64_t length = file->Length();
+  if (length < pending.base || length > pending.base + pending.added) return false;
+  const bool grew = length > pending.base;
+  if (grew) {
+    file->Truncate(pending.base);
     file->Sync();
-    if (each.base == 0) files_.Delete(each.path);
-    file->Close();
-    cut.push_back(each.path);
   }
-  return cut;
+  if (pending.base == 0) files_.Delete(pending.path);
+  file->Close();
+  return grew;
 }
 
-void NoticeFiles::Forget(const std::string& output) { files_.Delete(NotePath(output)); }
+void NoticeFiles::Forget(const std::string& name) { files_.Delete(NotePath(name)); }
 
-bool NoticeFiles::Begin(const std::string& output) {
-  note_ = NotePath(output);
-  heldNote_ = files_.OpenOutput(note_, OutputMode::kAppend);
-  if (heldNote_->Length() == 0) return true;
-  std::exchange(heldNote_, nullptr)->Close();
-  return false;
+bool NoticeFiles::Begin(const std::string& name) {
+  Held held;
+  held.notePath = NotePath(name);
+  held.note = files_.OpenOutput(held.notePath, OutputMode::kAppend);
+  if (held.note->Length() > 0) {
+    held.note->Close();
+    return false;
+  }
+  held_.push_back(std::move(held));
+  return true;
 }
 
 std::size_t NoticeFiles::Open(const std::string& path) {
-  const bool isNew = !files_.Exists(path);
-  auto file = files_.OpenOutput(path, OutputMode::kAppend);
-  const std::uint64_t base = file->Length();
-  open_.push_back({path, std::move(file), base, isNew, {}});
-  return open_.size() - 1;
+  Held& held = held_.back();
+  if (!files_.Exists(path)) NoteNew(held, path);
+  held.file = files_.OpenOutput(path, OutputMode::kAppend);
+  held.path = path;
+  held.base = held.file->Length();
+  return held_.size() - 1;
 }
 
-void NoticeFiles::WriteNote(const NoticeId& id) {
-  std::string note = std::string(kHead) + '\n' + NoteLine(id.ASNNo) + '\n' + std::to_string(id.shipmentId) + '\n' +
-                     std::to_string(id.orderId) + '\n';
-  for (const Held& held : open_) {
-    note += std::to_string(held.base) + ' ' + std::to_string(held.text.size()) + ' ' + NoteLine(held.path) + '\n';
+// A file that is made and then forgotten by a killed program would go to the partner empty. The note reaches the system
+// only by being closed, and is another's if it is not as it was left.
+void NoticeFiles::NoteNew(Held& held, const std::string& path) {
+  const std::string head = NoteHead(path, true);
+  held.note->Write(head);
+  held.note->Close();
+  held.note.reset();
+  auto again = files_.OpenOutput(held.notePath, OutputMode::kAppend);
+  if (again->Length() != head.size()) {
+    throw RunTimeError(run_time::kPermissionDenied, "Another program uses the file: " + held.notePath);
   }
-  heldNote_->Write(note.append(kFoot) + '\n');
-  heldNote_->Sync();
+  held.note = std::move(again);
+  held.isNew = true;
+}
+
+void NoticeFiles::WriteNote(Held& held, const NoticeId& id) {
+  std::string note = held.isNew ? std::string() : NoteHead(held.path, false);
+  note += NoteLine(id.ASNNo) + '\n';
+  for (const std::uint64_t number : {static_cast<std::uint64_t>(id.shipmentId), static_cast<std::uint64_t>(id.orderId),
+                                     held.base, static_cast<std::uint64_t>(held.text.size())}) {
+    note += std::to_string(number) + '\n';
+  }
+  held.note->Write(note.append(kFoot) + '\n');
+  held.note->Sync();
 }
 
 void NoticeFiles::Write(const NoticeId& id) {
   try {
-    WriteNote(id);
-    for (Held& held : open_) {
+    for (Held& held : held_) WriteNote(held, id);
+    for (Held& held : held_) {
       held.file->Write(held.text);
       held.file->Sync();
     }
@@ -131,14 +166,18 @@ void NoticeFiles::Write(const NoticeId& id) {
 }
 
 void NoticeFiles::Settle() {
-  for (Held& held : open_) held.file->Close();
-  open_.clear();
-  if (!heldNote_) return;
-  files_.Delete(note_);
-  std::exchange(heldNote_, nullptr)->Close();
+  std::vector<Held> settled = std::exchange(held_, {});
+  for (Held& held : settled) Ignoring([&] { held.file->Close(); });
+  for (Held& held : settled) {
+    Ignoring([&] {
+      files_.Delete(held.notePath);
+      held.note->Close();
+    });
+  }
 }
 
 void NoticeFiles::CutBack(Held& held) {
+  if (!held.file) return;
   if (held.file->Length() > held.base) {
     held.file->Truncate(held.base);
     held.file->Sync();
@@ -148,18 +187,12 @@ void NoticeFiles::CutBack(Held& held) {
 }
 
 void NoticeFiles::Abandon() {
-  bool whole = true;
-  for (Held& held : open_) {
-    try {
+  for (Held& held : std::exchange(held_, {})) {
+    Ignoring([&] {
       CutBack(held);
-    } catch (const RunTimeError&) {
-      whole = false;
-    }
+      if (held.note) files_.Delete(held.notePath);
+    });
   }
-  open_.clear();
-  if (!heldNote_) return;
-  if (whole) Ignoring([&] { files_.Delete(note_); });
-  Ignoring([&] { std::exchange(heldNote_, nullptr)->Close(); });
 }
 
 }  // namespace partnerkit::shipment

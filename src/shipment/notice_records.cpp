@@ -19,6 +19,23 @@ const R& NoticeRecords::Kept(std::unordered_map<K, R>& kept, const K& key, K R::
   return entry->second;
 }
 
+// What is asked for one by one costs several times as much.
+template <class R>
+void NoticeRecords::Fetch(std::unordered_map<std::int32_t, R>& into, const Lookup& lookup, const R& probe,
+                          std::int32_t R::*id) {
+  translator_.Try([&] {
+    R record;
+    const auto next = [&, first = true]() mutable -> void* {
+      if (!first) into.try_emplace(record.*id, std::move(record));
+      first = false;
+      record = {};
+      return &record;
+    };
+    translator_.Records().Select(R::kType, lookup, &probe, next);
+    if (record.*id != 0) into.try_emplace(record.*id, std::move(record));
+  });
+}
+
 void NoticeRecords::SetNotice(const ASN& asn, Text firstInvoiceNo) {
   asn_ = &asn;
   firstInvoiceNo_ = std::move(firstInvoiceNo);
@@ -34,6 +51,10 @@ void NoticeRecords::SetNotice(const ASN& asn, Text firstInvoiceNo) {
   jobs_.clear();
   locns_.clear();
   orderLines_.clear();
+  slipLines_.clear();
+  locnLines_.clear();
+  slipsFetched_.clear();
+  locnLinesAsked_ = 0;
   types_.clear();
   products_.clear();
 }
@@ -42,8 +63,8 @@ void NoticeRecords::SetPack(const partnerkit::Pack& pack) { pack_ = &pack; }
 
 void NoticeRecords::SetLine(const PackLine& line) {
   line_ = &line;
-  slipLine_.reset();
-  locnLine_.reset();
+  slipLine_ = nullptr;
+  locnLine_ = nullptr;
 }
 
 bool NoticeRecords::OrderComplete() {
@@ -91,18 +112,31 @@ const Product* NoticeRecords::FindProduct(const std::string& number) {
 const Product* NoticeRecords::LineProduct() { return FindProduct(line_->APN); }
 const Product* NoticeRecords::OrderedProduct() { return FindProduct(OrderedLine().ProductNo); }
 
+// A slip's cartons hold its lines, by and by all of them.
 const PSlipLine& NoticeRecords::SlipLine() {
-  if (!slipLine_) {
-    slipLine_.emplace().LineId = line_->PSlipLineId;
-    if (line_->PSlipLineId != 0) Read(*slipLine_);
+  if (slipLine_ == nullptr) {
+    if (!slipLines_.contains(line_->PSlipLineId) && pack_->PSlipId != 0 &&
+        slipsFetched_.insert(pack_->PSlipId).second) {
+      PSlipLine probe;
+      probe.PSlipId = pack_->PSlipId;
+      Fetch(slipLines_, PSlipLine::kByPSlip, probe, &PSlipLine::LineId);
+    }
+    slipLine_ = &Kept(slipLines_, line_->PSlipLineId, &PSlipLine::LineId);
   }
   return *slipLine_;
 }
 
+// A notice of a few cartons of a long order does without most of the order's lines.
 const OrderLocnLine& NoticeRecords::LocnLine() {
-  if (!locnLine_) {
-    locnLine_.emplace().Id = SlipLine().OrderLocnLineId;
-    if (locnLine_->Id != 0) Read(*locnLine_);
+  constexpr int kFew = 8;
+  if (locnLine_ == nullptr) {
+    const std::int32_t id = SlipLine().OrderLocnLineId;
+    if (!locnLines_.contains(id) && ++locnLinesAsked_ == kFew) {
+      OrderLocnLine probe;
+      probe.OrderId = order_.OrderId;
+      Fetch(locnLines_, OrderLocnLine::kByOrder, probe, &OrderLocnLine::Id);
+    }
+    locnLine_ = &Kept(locnLines_, id, &OrderLocnLine::Id);
   }
   return *locnLine_;
 }

@@ -7,6 +7,7 @@
 #include <string>
 #include <string_view>
 #include <unordered_map>
+#include <unordered_set>
 #include <vector>
 
 #include "frame/translator_base.h"
@@ -61,6 +62,8 @@ class NoticeRecords {
   bool Read(R& record);
   template <class R, class K>
   const R& Kept(std::unordered_map<K, R>& kept, const K& key, K R::*member);
+  template <class R>
+  void Fetch(std::unordered_map<std::int32_t, R>& into, const Lookup& lookup, const R& probe, std::int32_t R::*id);
   const PSlip& Slip();
   const Product* FindProduct(const std::string& number);
 
@@ -78,8 +81,12 @@ class NoticeRecords {
   std::unordered_map<std::int32_t, OrderLine> orderLines_;
   std::unordered_map<std::string, PackType> types_;
   std::unordered_map<std::string, std::optional<Product>> products_;
-  std::optional<PSlipLine> slipLine_;
-  std::optional<OrderLocnLine> locnLine_;
+  std::unordered_map<std::int32_t, PSlipLine> slipLines_;
+  std::unordered_map<std::int32_t, OrderLocnLine> locnLines_;
+  std::unordered_set<std::int32_t> slipsFetched_;
+  int locnLinesAsked_ = 0;
+  const PSlipLine* slipLine_ = nullptr;
+  const OrderLocnLine* locnLine_ = nullptr;
 };
 
 }  // namespace partnerkit::shipment

@@ -14,7 +14,7 @@ class FaultyFiles : public Files {
   explicit FaultyFiles(Files& real) : real_(real) {}
 
   // After `passed` good ones, the next `times` operations `what` ("Length", "OpenInput", "OpenOutput", "Delete",
-  // "Rename", "Copy", "Read", "Write" or "Sync") on a file whose path ends in `name` raise `number`.
+  // "Rename", "Copy", "Read", "Write", "Sync" or "Truncate") on a file whose path ends in `name` raise `number`.
   void Fail(std::string what, std::string name, std::int32_t number, int times = 1, int passed = 0) {
     fault_ = {std::move(what), std::move(name), number, times, passed};
   }
@@ -62,7 +62,7 @@ class FaultyFiles : public Files {
     void Write(std::string_view bytes) override { files.Check("Write", name), real->Write(bytes); }
     void Sync() override { files.Check("Sync", name), real->Sync(); }
     std::uint64_t Length() override { return real->Length(); }
-    void Truncate(std::uint64_t length) override { real->Truncate(length); }
+    void Truncate(std::uint64_t length) override { files.Check("Truncate", name), real->Truncate(length); }
     void Close() override { real->Close(); }
 
     FaultyFiles& files;

@@ -1,6 +1,6 @@
 """Kills `partnerkit process` at random moments and at the operations that a crash could come between, makes the
 disk fail under it, and checks each time that a plain second run leaves every order stored exactly once or still in the
-file.
+file, and every packed carton in exactly one stored notice.
 
     run.sh [long]                     the model class in full, the others by a sample: 20 minutes on two cores
     run.sh --class CLASS [long]       one class in full: ten minutes
@@ -30,6 +30,7 @@ import time
 from dataclasses import dataclass
 
 import failures
+import notices
 import order_samples
 import orders
 import x12_orders
@@ -38,6 +39,8 @@ from workspace import HarnessError, Program, Scenario, trace_of
 
 # The order file's own operations, told from the store's by the name of the file: what settling and its recovery do.
 SETTLING = ("po.csv", "orders.edi", "orders.tmp", "FA_PO_", "inbox", "backup", "outbox")
+# The same of a notice: its files and the notes beside them.
+NOTICE_FILES = ("asn", "stock", "outbox")
 
 # Behind a write, a truncation or a sync the disk is as it is before the next operation.
 EVERY = {"rename": ("kill-before", "kill-after"), "unlink": ("kill-before", "kill-after"),
@@ -53,7 +56,8 @@ TOLD = 3
 MEMORY_DISK = "/dev/shm"
 
 
-TRADES = {order_samples.OrderClass: orders.Trade, x12_samples.X12Class: x12_orders.X12Trade}
+TRADES = {order_samples.OrderClass: orders.Trade, x12_samples.X12Class: x12_orders.X12Trade,
+          notices.NoticeClass: notices.NoticeTrade}
 
 
 class Round:
@@ -82,6 +86,7 @@ SAMPLE = Extent(40, 40, 250, 250, 120)
 SHORT = Extent(25, 0, 50, 50, 30)
 GLANCE = Extent(0, 0, 25, 25, 15, failures=False)
 X12_GLANCE = Extent(0, 0, 16, 12, 8, failures=False)
+NOTICE_GLANCE = Extent(8, 0, 16, 12, 8)
 
 # large: what a partner sends on a busy day. small: every kind of order, few enough to strike at each operation.
 # emptied: all orders post, and the file goes when it is empty.
@@ -94,6 +99,11 @@ SCENARIOS = {
 
 class Torture:
     """One class under torture."""
+
+    settling = SETTLING
+    small = ("small", "emptied")
+    # What the shim has to see of a large run.
+    kinds = ("rename", "unlink", "sync", "truncate", "commit")
 
     def __init__(self, options, root, order_class):
         self.options = options
@@ -118,10 +128,13 @@ class Torture:
 
     # --- One round
 
-    def strike(self, folder, strike):
+    def process(self, scenario, folder, **how):
+        return self.program.process(folder, **how)
+
+    def strike(self, scenario, folder, strike):
         if strike.startswith("at:"):
-            return self.program.process(folder, until=float(strike[3:]))
-        return self.program.process(folder, strike=strike.replace(":", " "))
+            return self.process(scenario, folder, until=float(strike[3:]))
+        return self.process(scenario, folder, strike=strike.replace(":", " "))
 
     def run(self, a_round, keep=False):
         """Gives whether the last strike killed."""
@@ -129,10 +142,10 @@ class Torture:
         found = []
         struck = []
         for strike in a_round.strikes:
-            struck.append(self.strike(folder, strike))
+            struck.append(self.strike(a_round.scenario, folder, strike))
             found += self.verdict.struck_violations(a_round.scenario, folder, struck)
         killed = struck[-1].status == -signal.SIGKILL
-        last = self.program.process(folder)
+        last = self.process(a_round.scenario, folder)
         found += self.verdict.violations(a_round.scenario, folder, self.program, last, earlier=struck)
         self.close(f"repeat {a_round.text()}", folder, found, keep)
         with self.lock:
@@ -183,7 +196,7 @@ class Torture:
     def plain_run(self, scenario):
         folder = scenario.copy(self.root)
         began = time.monotonic()
-        last = self.program.process(folder)
+        last = self.process(scenario, folder)
         took = time.monotonic() - began
         self.close(f"repeat {scenario.name} at:1000", folder, self.verdict.violations(scenario, folder, self.program, last))
         return took
@@ -202,8 +215,8 @@ class Torture:
         """The operations of a plain run, after one that `first` has struck."""
         folder = scenario.copy(self.root)
         if first:
-            self.strike(folder, first)
-        _, operations = trace_of(self.program, folder, folder / "trace")
+            self.strike(scenario, folder, first)
+        _, operations = trace_of(lambda trace: self.process(scenario, folder, trace=trace), folder / "trace")
         shutil.rmtree(folder)
         return operations
 
@@ -213,11 +226,11 @@ class Torture:
             seen[kind] += 1
             yield kind, seen[kind], name
 
-    def operation_kills(self, scenario, kinds):
+    def operation_kills(self, scenario, kinds, needed=()):
         """A round for each operation of these kinds: before, behind, and a write in its middle."""
         rounds = []
         operations = list(self.numbered(self.traced(scenario)))
-        missing = set(kinds) - {kind for kind, _, _ in operations}
+        missing = set(needed or kinds) - {kind for kind, _, _ in operations}
         if missing:
             # A library linked in is out of the shim's reach.
             raise HarnessError(f"the shim sees no {', '.join(sorted(missing))}")
@@ -229,13 +242,13 @@ class Torture:
     def settling_kills(self, scenario, count):
         """Kills round the operations on order file and backup, each followed by a kill in the recovery from it."""
         firsts = [f"{action}:{kind}:{number}" for kind, number, name in self.numbered(self.traced(scenario))
-                  if name.startswith(SETTLING) for action in EVERY[kind]]
+                  if name.startswith(self.settling) for action in EVERY[kind]]
         rounds = []
         for first in self.sample(firsts, count):
             rounds.append(Round("operation kills", scenario, [first]))
             rounds += [Round("kills in a recovery", scenario, [first, f"kill-before:{then}:{at}"])
                        for then, at, where in self.numbered(self.traced(scenario, first))
-                       if where.startswith(SETTLING)]
+                       if where.startswith(self.settling)]
         return rounds
 
     def faults(self, scenario):
@@ -252,11 +265,11 @@ class Torture:
         if kills:
             self.random_kills(kills)
         if extent.large != 0:
-            rounds = self.operation_kills(self.scenario("large"), ("rename", "unlink", "sync", "truncate", "commit"))
+            rounds = self.operation_kills(self.scenario("large"), self.kinds)
             self.run_all("renames, deletions, syncs and commits", self.sample(rounds, extent.large))
-        both = [self.scenario("small"), self.scenario("emptied")]
+        both = [self.scenario(name) for name in self.small]
         for about, count, rounds in (
-                ("every operation", extent.small, lambda each: self.operation_kills(each, EVERY)),
+                ("every operation", extent.small, lambda each: self.operation_kills(each, EVERY, self.kinds)),
                 ("settling and its recovery", extent.settling,
                  lambda each: self.settling_kills(each, extent.settling and 1 + extent.settling // 10)),
                 ("faults", extent.faults, self.faults)):
@@ -274,8 +287,8 @@ class Torture:
 
     def repeat(self):
         scenario, *strikes = self.options.what
-        if scenario not in SCENARIOS or not strikes:
-            raise HarnessError(f"repeat wants a scenario ({', '.join(SCENARIOS)}) and its strikes")
+        if scenario not in ("large", *self.small) or not strikes:
+            raise HarnessError(f"repeat wants a scenario (large, {', '.join(self.small)}) and its strikes")
         self.run(Round("rounds", self.scenario(scenario), strikes), keep=True)
 
     def total(self):
@@ -284,6 +297,27 @@ class Torture:
             if alike:
                 print(f"{count} times: {alike.splitlines()[0]}")
         return ", ".join([*counted, f"{self.found} violations"])
+
+
+class NoticeTorture(Torture):
+    """The ship notices' class."""
+
+    settling = NOTICE_FILES
+    small = ("small", "single")
+    kinds = ("unlink", "sync", "commit")
+
+    def scenario(self, name):
+        if name not in self.prepared:
+            self.prepared[name] = notices.NoticeScenario(self.program, self.root, name, **notices.SCENARIOS[name])
+        return self.prepared[name]
+
+    def process(self, scenario, folder, **how):
+        return self.program.process(folder, name=scenario.output, **how)
+
+    def other_failures(self, slow, names=()):
+        for name, folder, found in notices.run(self.program, self.scenario("large"), self.root, names):
+            self.counts["other failures"] += 1
+            self.close(f"failures '{name}'", folder, found)
 
 
 def default_folder():
@@ -299,7 +333,7 @@ def main():
     parser = argparse.ArgumentParser(description=__doc__, formatter_class=argparse.RawDescriptionHelpFormatter)
     parser.add_argument("form", nargs="?", default="long", choices=("long", "short", "failures", "repeat"))
     parser.add_argument("what", nargs="*", help="for repeat: SCENARIO STRIKE...; for failures: names")
-    every_class = [*order_samples.order_classes(), *x12_samples.x12_classes()]
+    every_class = [*order_samples.order_classes(), *x12_samples.x12_classes(), notices.NoticeClass()]
     parser.add_argument("--class", dest="named", metavar="CLASS", type=without_library, choices=[each.name for each in every_class],
                         help="the class; for repeat and failures the model class if none is named")
     parser.add_argument("--seed", type=int, default=1, help="of the random moments and samples, %(default)s")
@@ -313,7 +347,8 @@ def main():
     found = 0
     for order_class in classes:
         root = pathlib.Path(tempfile.mkdtemp(prefix="partnerkit-torture-", dir=options.folder))
-        torture = Torture(options, root, order_class)
+        compiles = isinstance(order_class, notices.NoticeClass)
+        torture = (NoticeTorture if compiles else Torture)(options, root, order_class)
         model = order_class is classes[0]
         began = time.monotonic()
         try:
@@ -324,8 +359,8 @@ def main():
             elif options.form == "long":
                 torture.all_sorts(FULL if model else SAMPLE, slow=model)
             else:
-                glance = GLANCE if torture.trade.backs_up else X12_GLANCE
-                torture.all_sorts(SHORT if model else glance, slow=False)
+                glance = NOTICE_GLANCE if compiles else GLANCE if torture.trade.backs_up else X12_GLANCE
+                torture.all_sorts(SHORT if model and not compiles else glance, slow=False)
         except HarnessError as error:
             print(f"torture: {order_class.name}: {error}", file=sys.stderr)
             return 2

@@ -92,11 +92,11 @@ class Program:
     def run(self, folder, *arguments, **how):
         return self.finish(self.start(folder, *arguments, **how))
 
-    def process(self, folder, *, until=None, **how):
+    def process(self, folder, *, until=None, name=ORDER_FILE, **how):
         """`until`: the run is killed so many seconds after its start, unless it has ended by then."""
-        path = pathlib.Path(folder) / ORDER_FILE
+        path = pathlib.Path(folder) / name
         order_file = path.read_bytes() if path.is_file() else None
-        process = self.start(folder, "process", "1", ORDER_FILE, **how)
+        process = self.start(folder, "process", "1", name, **how)
         timer = threading.Timer(until or 0, process.kill)
         if until is not None:
             timer.start()
@@ -151,10 +151,10 @@ def must(ended):
         raise HarnessError(f"the workspace cannot be prepared: status {ended.status}: {ended.err}")
 
 
-def trace_of(program, folder, trace, **how):
-    """The operations of a plain run, each as (kind, name of the file)."""
+def trace_of(process, trace):
+    """The operations of the run that `process(trace)` makes, each as (kind, name of the file)."""
     trace.unlink(missing_ok=True)
-    ended = program.process(folder, trace=trace, **how)
+    ended = process(trace)
     operations = [tuple(line.rstrip("\n").split(" ", 1)) for line in trace.read_text().splitlines(True)]
     trace.unlink()
     return ended, operations

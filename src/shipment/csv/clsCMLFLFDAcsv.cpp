@@ -18,9 +18,9 @@ void PalletType(NoticeRecords& records, std::string& value) {
 }
 
 constexpr NoticeField kOwn[] = {
-    {"SHIPNOTETYPECODE",     Level::kPack, TypeCode},
-    {"SHIPNOTEFUNCTIONCODE", Level::kPack, [](NoticeRecords&, std::string& v) { v = "9"; }},
-    {"PALLETTYPECODE",       Level::kPack, PalletType},
+    {"SHIPNOTETYPECODE",     Level::kNotice, TypeCode},
+    {"SHIPNOTEFUNCTIONCODE", Level::kNotice, [](NoticeRecords&, std::string& v) { v = "9"; }},
+    {"PALLETTYPECODE",       Level::kPack,   PalletType},
 };
 // clang-format on
 
@@ -52,7 +52,7 @@ bool clsCMLFLFDAcsv::CheckNotice(Notice& notice) {
     notice.log.Note(kRejection, "DA Error ", "Scheduled date Null");
     return false;
   }
-  if (delivery->Date() <= cancel->Date()) return true;
+  if (delivery->Date().Seconds() <= cancel->Date().Seconds()) return true;
   notice.log.Note(kRejection, "DA Warning ",
                   "Shipment scheduled delivery date " + Format(*delivery, "Short Date") +
                       " greater then order Required date " + Format(*cancel, "Short Date"));

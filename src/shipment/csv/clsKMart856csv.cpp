@@ -24,14 +24,14 @@ void OrderStatus(NoticeRecords& records, std::string& value) {
 }
 
 constexpr NoticeField kOwn[] = {
-    {"SHIPNOTENO",      Level::kPack, fill::AsnNo2},
-    {"ORDERNO",         Level::kPack, OrderNo},
-    {"ORDERSTATUSCODE", Level::kPack, OrderStatus},
-    {"POVERSIONNO",     Level::kPack, fill::OrderHeader2},
-    {"INVOICENO",       Level::kPack, fill::FirstInvoiceNo},
-    {"PALLETNO",        Level::kPack, fill::PalletNo},
-    {"PACKMARKTYPE",    Level::kPack, [](NoticeRecords&, std::string& v) { v = "GM"; }},
-    {"PACKAGETYPECODE", Level::kPack, fill::ShipPackCode},
+    {"SHIPNOTENO",      Level::kNotice, fill::AsnNo2},
+    {"ORDERNO",         Level::kPack,   OrderNo},
+    {"ORDERSTATUSCODE", Level::kNotice, OrderStatus},
+    {"POVERSIONNO",     Level::kNotice, fill::OrderHeader2},
+    {"INVOICENO",       Level::kNotice, fill::FirstInvoiceNo},
+    {"PALLETNO",        Level::kPack,   fill::PalletNo},
+    {"PACKMARKTYPE",    Level::kPack,   [](NoticeRecords&, std::string& v) { v = "GM"; }},
+    {"PACKAGETYPECODE", Level::kPack,   fill::ShipPackCode},
 };
 // clang-format on
 

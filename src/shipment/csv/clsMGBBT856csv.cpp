@@ -15,9 +15,9 @@ constexpr std::string_view kAdded[] = {
 };
 
 constexpr NoticeField kOwn[] = {
-    {"DATESHIPPED",  Level::kPack, fill::ScheduleDate},
-    {"DELREFERENCE", Level::kPack, fill::FirstInvoiceNo},
-    {"INVOICENO",    Level::kPack, fill::FirstInvoiceNo},
+    {"DATESHIPPED",  Level::kNotice, fill::ScheduleDate},
+    {"DELREFERENCE", Level::kNotice, fill::FirstInvoiceNo},
+    {"INVOICENO",    Level::kNotice, fill::FirstInvoiceNo},
 };
 // clang-format on
 
@@ -40,6 +40,7 @@ bool clsMGBBT856csv::FillPack(Notice& notice, const Pack& pack) {
   if (!CsvNotice::FillPack(notice, pack)) return false;
   const auto subPacks = Values().SubPacks();
   if (subPacks.size() > kMostSubPacks) {
+    LogPacks(notice);
     notice.log.Note(kRejection, "New ASN ", "Only 20 Sub Packs allowed per lead pack");
     return false;
   }

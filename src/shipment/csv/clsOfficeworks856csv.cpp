@@ -15,17 +15,18 @@ constexpr std::string_view kFields[] = {
 };
 
 constexpr NoticeField kOwn[] = {
-    {"SHIPNOTENO",       Level::kPack, fill::AsnNo2},
-    {"SHIPNOTETYPECODE", Level::kPack, [](NoticeRecords&, std::string& v) { v = "9"; }},
-    {"DELIVERYDATE",     Level::kPack, fill::DeliveryDateLong},
-    {"DATESHIPPED",      Level::kPack, fill::ScheduleDateLong},
-    {"ORDERNO",          Level::kPack, fill::OrderNoLessRelease},
-    {"ORDERDATE",        Level::kPack, fill::OrderDateLong},
-    {"ORDERSTATUSCODE",  Level::kPack, [](NoticeRecords& r, std::string& v) { v = r.OrderComplete() ? "164" : "165"; }},
-    {"POVERSIONNO",      Level::kPack, fill::OrderHeader2},
-    {"PALLETNO",         Level::kPack, fill::PalletNo},
-    {"PACKMARKTYPE",     Level::kPack, [](NoticeRecords&, std::string& v) { v = "GM"; }},
-    {"PACKTYPECODE",     Level::kPack, fill::ShipPackCode},
+    {"SHIPNOTENO",       Level::kNotice, fill::AsnNo2},
+    {"SHIPNOTETYPECODE", Level::kNotice, [](NoticeRecords&, std::string& v) { v = "9"; }},
+    {"DELIVERYDATE",     Level::kNotice, fill::DeliveryDateLong},
+    {"DATESHIPPED",      Level::kNotice, fill::ScheduleDateLong},
+    {"ORDERNO",          Level::kNotice, fill::OrderNoLessRelease},
+    {"ORDERDATE",        Level::kNotice, fill::OrderDateLong},
+    {"ORDERSTATUSCODE",  Level::kNotice,
+     [](NoticeRecords& r, std::string& v) { v = r.OrderComplete() ? "164" : "165"; }},
+    {"POVERSIONNO",      Level::kNotice, fill::OrderHeader2},
+    {"PALLETNO",         Level::kPack,   fill::PalletNo},
+    {"PACKMARKTYPE",     Level::kPack,   [](NoticeRecords&, std::string& v) { v = "GM"; }},
+    {"PACKTYPECODE",     Level::kPack,   fill::ShipPackCode},
 };
 // clang-format on
 

@@ -16,13 +16,15 @@ constexpr std::string_view kFields[] = {
 };
 
 constexpr NoticeField kOwn[] = {
-    {"SHIPNOTENO",      Level::kPack, [](NoticeRecords& r, std::string& v) { v = Format(r.Asn().ASNNo, "000000000"); }},
-    {"BILLOFLADINGNO",  Level::kPack, [](NoticeRecords& r, std::string& v) { v = Str(r.Shipment().BillOfLadingNo); }},
-    {"DATESHIPPED",     Level::kPack, fill::ScheduleDate},
-    {"ORDERSTATUSCODE", Level::kPack, [](NoticeRecords& r, std::string& v) { v = r.Shipment().Complete ? "CC" : "SS"; }},
-    {"PALLETNO",        Level::kPack, fill::PalletNo},
-    {"PACKMARKTYPE",    Level::kPack, [](NoticeRecords&, std::string& v) { v = "GM"; }},
-    {"PACKTYPECODE",    Level::kPack, fill::PackageTypeCode},
+    {"SHIPNOTENO",      Level::kNotice,
+     [](NoticeRecords& r, std::string& v) { v = Format(r.Asn().ASNNo, "000000000"); }},
+    {"BILLOFLADINGNO",  Level::kNotice, [](NoticeRecords& r, std::string& v) { v = Str(r.Shipment().BillOfLadingNo); }},
+    {"DATESHIPPED",     Level::kNotice, fill::ScheduleDate},
+    {"ORDERSTATUSCODE", Level::kNotice,
+     [](NoticeRecords& r, std::string& v) { v = r.Shipment().Complete ? "CC" : "SS"; }},
+    {"PALLETNO",        Level::kPack,   fill::PalletNo},
+    {"PACKMARKTYPE",    Level::kPack,   [](NoticeRecords&, std::string& v) { v = "GM"; }},
+    {"PACKTYPECODE",    Level::kPack,   fill::PackageTypeCode},
 };
 // clang-format on
 

@@ -64,6 +64,7 @@ const NoticeField* CsvNotice::SourceOf(std::string_view name) const {
 void CsvNotice::BindColumns() {
   map_.Clear();
   columns_.clear();
+  perNotice_.clear();
   perPack_.clear();
   perLine_.clear();
   for (const std::string& column : header_) {
@@ -72,7 +73,7 @@ void CsvNotice::BindColumns() {
       field = &map_.Add(column);
       const NoticeField* const source = SourceOf(column);
       if (source != nullptr && source->fill != nullptr) {
-        (source->level == Level::kPack ? perPack_ : perLine_).push_back({field, source->fill});
+        FilledPer(source->level).push_back({field, source->fill});
       }
     }
     columns_.push_back(field);
@@ -116,14 +117,23 @@ bool CsvNotice::WriteNotice(Notice& notice) {
   records_.waitingPacks = WaitingPacks();
   records_.waitingCartons = WaitingCartons();
   records_.linesWritten = 0;
+  Fill(perNotice_);
   for (const auto& pack : notice.packs) {
     if (!WritePack(notice, *pack)) return false;
   }
   return true;
 }
 
+std::vector<CsvNotice::Filled>& CsvNotice::FilledPer(Level level) {
+  return level == Level::kNotice ? perNotice_ : level == Level::kPack ? perPack_ : perLine_;
+}
+
+void CsvNotice::Fill(const std::vector<Filled>& fields) {
+  for (const Filled& filled : fields) filled.fill(records_, filled.field->FieldValue);
+}
+
 bool CsvNotice::FillPack(Notice&, const Pack&) {
-  for (const Filled& filled : perPack_) filled.fill(records_, filled.field->FieldValue);
+  Fill(perPack_);
   return true;
 }
 
@@ -135,7 +145,7 @@ bool CsvNotice::WritePack(Notice& notice, const Pack& pack) {
   std::string told = "......Pack " + std::string(Str(pack.SSCC)) + " added to ConNote " +
                      std::string(Str(records_.Shipment().ConNoteNo));
   if (values_.logsOrder) told += " for PONo " + records_.Order().PONo;
-  notice.log.Note(kInformation, "Process Pack", told);
+  notice.packsTold.push_back(std::move(told));
   if (values_.lines == NoticeLines::kEach) {
     WriteEach(notice, lines);
   } else {
@@ -146,7 +156,7 @@ bool CsvNotice::WritePack(Notice& notice, const Pack& pack) {
 
 void CsvNotice::SetLine(const PackLine& line) {
   records_.SetLine(line);
-  for (const Filled& filled : perLine_) filled.fill(records_, filled.field->FieldValue);
+  Fill(perLine_);
 }
 
 bool CsvNotice::FollowOn(Notice& notice) {
@@ -176,8 +186,8 @@ void CsvNotice::WriteRuns(Notice& notice, const Lines& lines) {
 
 void CsvNotice::WriteEach(Notice& notice, const Lines& lines) {
   for (const auto& line : lines) {
-    if (line->Quantity <= 0) continue;
     SetLine(*line);
+    if (line->Quantity <= 0) continue;
     WriteLine(notice);
     WriteInventory(notice);
   }

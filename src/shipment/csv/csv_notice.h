@@ -51,8 +51,8 @@ class CsvNotice : public CompileFrame {
   bool WriteNotice(Notice& notice) override;
   bool FollowOn(Notice& notice) override;
 
-  // --- Steps of this family. False ends the notice, with the reason noted.
-  // Before it is numbered; its shipment and order are at hand.
+  // --- Steps that may end the notice: false, with the reason noted.
+  // Before it is numbered.
   virtual bool CheckNotice(Notice&) { return true; }
   // Before anything of the pack is written.
   virtual bool FillPack(Notice& notice, const Pack& pack);
@@ -74,6 +74,8 @@ class CsvNotice : public CompileFrame {
   bool ReadMap(const std::string& path);
   void BindColumns();
   bool WritePack(Notice& notice, const Pack& pack);
+  void Fill(const std::vector<Filled>& fields);
+  std::vector<Filled>& FilledPer(Level level);
   void SetLine(const PackLine& line);
   void WriteRuns(Notice& notice, const Lines& lines);
   void WriteEach(Notice& notice, const Lines& lines);
@@ -87,7 +89,7 @@ class CsvNotice : public CompileFrame {
   MapHeader header_;
   FieldMap map_;                    // the fields that the partner knows and the map names
   std::vector<MapField*> columns_;  // in the map's order; null for a column that stays empty
-  std::vector<Filled> perPack_, perLine_;
+  std::vector<Filled> perNotice_, perPack_, perLine_;
   MapField* quantity_ = nullptr;
 };
 

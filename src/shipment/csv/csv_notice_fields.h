@@ -9,7 +9,8 @@
 
 namespace partnerkit::shipment {
 
-enum class Level { kPack, kLine };
+// How often a field is filled.
+enum class Level { kNotice, kPack, kLine };
 
 struct NoticeField {
   std::string_view name;
