@@ -126,7 +126,7 @@ class Run {
     CommitHost();
     report_.withResults = withResults;
     report_.logIds = host_.LogIds();
-    PrintRun(command_, report_, workspace_.Host().Records());
+    PrintRun(command_, report_, host_.Records());
     workspace_.Host().Close();
     return workspace_.HadFault() ? kTurnedAway : status_;
   }
@@ -155,7 +155,7 @@ class Run {
     return errorLog && !errorLog->empty() && std::ranges::all_of(*errorLog, [&](std::int32_t id) {
              Log log;
              log.LogId = id;
-             return workspace_.Host().Records().Load(Log::kType, &log) && log.ErrorNumber == kWarning;
+             return host_.Records().Load(Log::kType, &log) && log.ErrorNumber == kWarning;
            });
   }
 

@@ -31,6 +31,7 @@ class WatchedHost : public System, private RecordStore {
   void RollbackTrans() override {
     host_.RollbackTrans();
     if (logIds_.size() > logIdsBefore_) logIds_.resize(logIdsBefore_);
+    logs_.resize(logIds_.size());
   }
   std::vector<EDIDoc> EDIDocList() override { return host_.EDIDocList(); }
   std::int32_t NextNumber(std::string_view partnerId, Counter counter) override {
@@ -47,7 +48,8 @@ class WatchedHost : public System, private RecordStore {
   std::optional<std::string> Setting(std::string_view name) override { return host_.Setting(name); }
 
  private:
-  bool Load(const RecordType& type, void* record) override { return records_.Load(type, record); }
+  // A log record of this run is at hand: a long run's report asks for many.
+  bool Load(const RecordType& type, void* record) override;
   bool Add(const RecordType& type, void* record) override;
   bool Update(const RecordType& type, const void* record) override { return records_.Update(type, record); }
   bool Delete(const RecordType& type, const void* record) override { return records_.Delete(type, record); }
@@ -66,6 +68,7 @@ class WatchedHost : public System, private RecordStore {
   host::SqlHost& host_;
   RecordStore& records_;
   std::vector<std::int32_t> logIds_;
+  std::vector<Log> logs_;         // of the same
   std::size_t logIdsBefore_ = 0;  // the transaction
   std::int32_t ordersDeleted_ = 0;
 };
