@@ -13,56 +13,12 @@
 #include <string>
 #include <vector>
 
+#include "bare_sqlite.h"
 #include "stopwatch.h"
 
 namespace {
 
 constexpr int kIncomplete = 9;
-
-class Database {
- public:
-  Database(const char* path, int flags) { Check(sqlite3_open_v2(path, &handle_, flags, nullptr)); }
-  ~Database() { sqlite3_close(handle_); }
-  Database(const Database&) = delete;
-  Database& operator=(const Database&) = delete;
-
-  void Check(int result) const {
-    if (result != SQLITE_OK) throw std::runtime_error(sqlite3_errmsg(handle_));
-  }
-  void Run(const char* sql) const { Check(sqlite3_exec(handle_, sql, nullptr, nullptr, nullptr)); }
-  sqlite3* Handle() const { return handle_; }
-
- private:
-  sqlite3* handle_ = nullptr;
-};
-
-class Query {
- public:
-  Query(const Database& database, const std::string& sql) : database_(database) {
-    database.Check(
-        sqlite3_prepare_v3(database.Handle(), sql.c_str(), -1, SQLITE_PREPARE_PERSISTENT, &handle_, nullptr));
-  }
-  ~Query() { sqlite3_finalize(handle_); }
-  Query(const Query&) = delete;
-  Query& operator=(const Query&) = delete;
-
-  // True when there is a row.
-  bool Step() {
-    const int result = sqlite3_step(handle_);
-    if (result != SQLITE_ROW && result != SQLITE_DONE) database_.Check(result);
-    return result == SQLITE_ROW;
-  }
-  // For a statement without rows.
-  void Execute() {
-    Step();
-    database_.Check(sqlite3_reset(handle_));
-  }
-  sqlite3_stmt* Handle() const { return handle_; }
-
- private:
-  const Database& database_;
-  sqlite3_stmt* handle_ = nullptr;
-};
 
 struct Value {
   int type = SQLITE_NULL;

@@ -15,64 +15,10 @@
 #include <string_view>
 #include <vector>
 
+#include "bare_sqlite.h"
 #include "stopwatch.h"
 
 namespace {
-
-class Database {
- public:
-  explicit Database(const char* path) { Check(sqlite3_open_v2(path, &handle_, SQLITE_OPEN_READWRITE, nullptr)); }
-  ~Database() { sqlite3_close(handle_); }
-  Database(const Database&) = delete;
-  Database& operator=(const Database&) = delete;
-
-  void Check(int result) const {
-    if (result != SQLITE_OK) throw std::runtime_error(sqlite3_errmsg(handle_));
-  }
-  void Run(const char* sql) const { Check(sqlite3_exec(handle_, sql, nullptr, nullptr, nullptr)); }
-  sqlite3* Handle() const { return handle_; }
-
- private:
-  sqlite3* handle_ = nullptr;
-};
-
-class Query {
- public:
-  Query(const Database& database, const char* sql) : database_(database) {
-    database.Check(sqlite3_prepare_v3(database.Handle(), sql, -1, SQLITE_PREPARE_PERSISTENT, &handle_, nullptr));
-  }
-  ~Query() { sqlite3_finalize(handle_); }
-  Query(const Query&) = delete;
-  Query& operator=(const Query&) = delete;
-
-  template <class... Ids>
-  Query& With(Ids... ids) {
-    sqlite3_reset(handle_);
-    int place = 0;
-    (Bind(++place, ids), ...);
-    return *this;
-  }
-  bool Step() {
-    const int result = sqlite3_step(handle_);
-    if (result != SQLITE_ROW && result != SQLITE_DONE) database_.Check(result);
-    return result == SQLITE_ROW;
-  }
-  std::string_view Text(int column) const {
-    const auto* text = reinterpret_cast<const char*>(sqlite3_column_text(handle_, column));
-    return {text == nullptr ? "" : text, static_cast<std::size_t>(sqlite3_column_bytes(handle_, column))};
-  }
-  std::int64_t Whole(int column) const { return sqlite3_column_int64(handle_, column); }
-  double Real(int column) const { return sqlite3_column_double(handle_, column); }
-
- private:
-  void Bind(int place, std::int64_t id) { sqlite3_bind_int64(handle_, place, id); }
-  void Bind(int place, std::string_view text) {
-    sqlite3_bind_text(handle_, place, text.data(), static_cast<int>(text.size()), SQLITE_TRANSIENT);
-  }
-
-  const Database& database_;
-  sqlite3_stmt* handle_ = nullptr;
-};
 
 std::string Shown(const char* format, double number) {
   std::array<char, 40> text{};

@@ -15,8 +15,8 @@ namespace {
 constexpr double kUnitsInACarton = 16;
 constexpr std::int32_t kCarrier = 1;
 
-// Serial shipping container code: an extension digit, the company's GS1 prefix, a serial number, and the check digit of
-// GS1 General Specifications 7.9.
+// Serial shipping container code: an extension digit, the company's GS1 prefix, a serial number, and GS1's check digit
+// (weights 3 and 1 in turn).
 std::string Sscc(std::int32_t serial) {
   std::string digits = "09312345" + Format(static_cast<double>(serial), "000000000");
   int sum = 0;

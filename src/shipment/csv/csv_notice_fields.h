@@ -50,11 +50,6 @@ void LineUseBy(NoticeRecords& records, std::string& value);
 void LineCount(NoticeRecords& records, std::string& value);
 // "164" or "165", by the shipment.
 void ShipmentStatusCode(NoticeRecords& records, std::string& value);
-
-template <const char* text>
-void Constant(NoticeRecords&, std::string& value) {
-  value = text;
-}
 }  // namespace fill
 
 // The order number without a release number behind it.
