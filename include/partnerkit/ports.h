@@ -60,6 +60,8 @@ class Files {
   virtual ~Files() = default;
   virtual std::uint64_t Length(const std::string& path) = 0;
   virtual bool Exists(const std::string& path) = 0;
+  // The path in a form that means the same file to a later run, started in another folder.
+  virtual std::string FullName(const std::string& path) { return path; }
   virtual std::unique_ptr<InputFile> OpenInput(const std::string& path, Share share) = 0;
   // Exclusive: an output file is never shared.
   virtual std::unique_ptr<OutputFile> OpenOutput(const std::string& path, OutputMode mode) = 0;

@@ -442,6 +442,22 @@ struct ASN {
   std::optional<DateTime> AcknowledgedDate;
 };
 
+// A file that grows by a notice which isn't stored yet: what to take out of it, should the program stop before that.
+struct PendingNotice {
+  static const RecordType kType;
+  static const Lookup kByVendorAndPartner;
+  static const Lookup kByFileName;
+
+  std::int32_t Id = 0;
+  std::string VendorId;
+  std::string PartnerId;
+  std::string ASNNo;
+  std::string FileName;
+  bool NewFile = false;
+  std::int64_t LengthBefore = 0;
+  std::int64_t LengthAdded = 0;
+};
+
 // A carton or pallet.
 struct Pack {
   static const RecordType kType;

@@ -107,8 +107,9 @@ class System {
   // All document definitions, by `EDIDocId`.
   virtual std::vector<EDIDoc> EDIDocList() = 0;
   // Moves a counter of the partner on by one and gives the new number, durable at once: no number is given twice,
-  // whatever crashes and however many programs share the store. Raises RunTimeError when the partner is unknown or the
-  // store fails, and within BeginTrans, where a number could be taken back.
+  // whatever crashes and however many programs share the store. Within BeginTrans it is as durable as the transaction,
+  // and taken back with it: such a number must not leave the program before. Raises RunTimeError when the partner is
+  // unknown or the store fails.
   virtual std::int32_t NextNumber(std::string_view partnerId, Counter counter) = 0;
 
   // The packs that wait for a ship notice to the partner, in the order in which they are compiled: packs of one

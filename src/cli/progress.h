@@ -37,6 +37,7 @@ class ProgressFiles : public Files {
 
   std::uint64_t Length(const std::string& path) override { return files_.Length(path); }
   bool Exists(const std::string& path) override { return files_.Exists(path); }
+  std::string FullName(const std::string& path) override { return files_.FullName(path); }
   std::unique_ptr<InputFile> OpenInput(const std::string& path, Share share) override;
   std::unique_ptr<OutputFile> OpenOutput(const std::string& path, OutputMode mode) override {
     return files_.OpenOutput(path, mode);

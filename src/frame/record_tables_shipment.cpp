@@ -12,6 +12,7 @@ constexpr std::string_view kPSlipId[]              = {"PSlipId"};
 constexpr std::string_view kOrderLocnLineId[]      = {"OrderLocnLineId"};
 constexpr std::string_view kPartnerIdAndASNNo[]    = {"PartnerId", "ASNNo"};
 constexpr std::string_view kVendorIdAndPartnerId[] = {"VendorId", "PartnerId"};
+constexpr std::string_view kFileName[]             = {"FileName"};
 constexpr std::string_view kShipmentId[]           = {"ShipmentId"};
 constexpr std::string_view kInterchangeNo[]        = {"InterchangeNo"};
 constexpr std::string_view kGroupNo[]              = {"GroupNo"};
@@ -110,6 +111,22 @@ constexpr Lookup kASNLookups[] = {
 };
 constexpr RecordType ASN::kType = {"ASN", "tbASN", kASNMembers, kASNLookups,
     "A ship notice: one shipment of one order, as told to the partner."};
+
+constexpr Member kPendingNoticeMembers[] = {
+    Id<&PendingNotice::Id>             ("Id"),
+    Field<&PendingNotice::VendorId>    ("VendorId"),
+    Field<&PendingNotice::PartnerId>   ("PartnerId"),
+    Field<&PendingNotice::ASNNo>       ("ASNNo"),
+    Field<&PendingNotice::FileName>    ("FileName"),
+    Field<&PendingNotice::NewFile>     ("NewFile"),
+    Field<&PendingNotice::LengthBefore>("LengthBefore"),
+    Field<&PendingNotice::LengthAdded> ("LengthAdded"),
+};
+constexpr Lookup PendingNotice::kByVendorAndPartner = {"ByVendorAndPartner", kVendorIdAndPartnerId};
+constexpr Lookup PendingNotice::kByFileName         = {"ByFileName",         kFileName};
+constexpr Lookup kPendingNoticeLookups[] = {PendingNotice::kByVendorAndPartner, PendingNotice::kByFileName};
+constexpr RecordType PendingNotice::kType = {"PendingNotice", "tbPendingNotice", kPendingNoticeMembers,
+    kPendingNoticeLookups, "A file that a notice is being written to, until the notice is stored."};
 
 constexpr Member kPackMembers[] = {
     Id<&Pack::Id>              ("Id"),

@@ -60,6 +60,31 @@ struct SqlHost::Parts {
     });
   }
 
+  // Within a transaction, that no other program moves the counter meanwhile.
+  std::int32_t NextNumber(std::string_view partnerId, Counter counter) {
+    const std::string column = Quoted(ColumnOf(counter));
+    const std::string table = Quoted(Partner::kType.table);
+    return session.Guarded([&] {
+      Statement& last = Prepared("SELECT " + column + " FROM " + table + " WHERE \"PartnerId\"=:p0",
+                                 {MemberKind::kString}, {MemberKind::kLong});
+      last.Parameter(0).Set(partnerId);
+      const bool found = last.Execute();
+      const std::int64_t next = last.Column(0).whole + 1;
+      last.Reset();
+      if (!found) session.Raise("there is no partner \"" + std::string(partnerId) + "\"");
+      if (next > std::numeric_limits<std::int32_t>::max()) {
+        throw RunTimeError(run_time::kOverflow, session.Name() + ": partner " + std::string(partnerId) +
+                                                    " has used up its " + std::string(ColumnOf(counter)));
+      }
+      Statement& move = Prepared("UPDATE " + table + " SET " + column + "=:p0 WHERE \"PartnerId\"=:p1",
+                                 {MemberKind::kLong, MemberKind::kString}, {});
+      move.Parameter(0).Set(next);
+      move.Parameter(1).Set(partnerId);
+      move.Execute();
+      return static_cast<std::int32_t>(next);
+    });
+  }
+
   SqlSession session;
   SqlStore store;
   std::map<std::string, std::unique_ptr<Statement>> statements;
@@ -145,31 +170,12 @@ std::vector<EDIDoc> SqlHost::EDIDocList() {
 
 std::int32_t SqlHost::NextNumber(std::string_view partnerId, Counter counter) {
   SqlSession& session = parts_->session;
-  const std::string column = Quoted(ColumnOf(counter));
-  const std::string table = Quoted(Partner::kType.table);
+  if (session.InExplicit()) return parts_->NextNumber(partnerId, counter);
   session.Begin();
   try {
-    const std::int64_t number = session.Guarded([&] {
-      Statement& last = parts_->Prepared("SELECT " + column + " FROM " + table + " WHERE \"PartnerId\"=:p0",
-                                         {MemberKind::kString}, {MemberKind::kLong});
-      last.Parameter(0).Set(partnerId);
-      const bool found = last.Execute();
-      const std::int64_t next = last.Column(0).whole + 1;
-      last.Reset();
-      if (!found) session.Raise("there is no partner \"" + std::string(partnerId) + "\"");
-      if (next > std::numeric_limits<std::int32_t>::max()) {
-        throw RunTimeError(run_time::kOverflow, session.Name() + ": partner " + std::string(partnerId) +
-                                                    " has used up its " + std::string(ColumnOf(counter)));
-      }
-      Statement& move = parts_->Prepared("UPDATE " + table + " SET " + column + "=:p0 WHERE \"PartnerId\"=:p1",
-                                         {MemberKind::kLong, MemberKind::kString}, {});
-      move.Parameter(0).Set(next);
-      move.Parameter(1).Set(partnerId);
-      move.Execute();
-      return next;
-    });
+    const std::int32_t number = parts_->NextNumber(partnerId, counter);
     session.CommitExplicit();
-    return static_cast<std::int32_t>(number);
+    return number;
   } catch (...) {
     session.RollbackExplicit();
     throw;

@@ -67,6 +67,8 @@ class SqlSession {
   void Close();
   // As the database sees it: false, too, when it has taken the open one back.
   bool InTransaction();
+  // One that Begin opened.
+  bool InExplicit() const { return state_ == State::kExplicit; }
 
   // The newest failure's number, 0 after a success.
   std::int32_t NativeError() const { return nativeError_; }

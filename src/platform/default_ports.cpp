@@ -22,10 +22,16 @@ constexpr std::size_t kLongestComputerName = 30;
 // The log of a computer with a longer path has always shown this much of it.
 constexpr std::size_t kLongestProgramPath = 255;
 
-std::optional<std::string> ComputerName() {
+std::optional<std::string> ReadComputerName() {
   std::array<char, 256> name{};  // gethostname leaves a name that fills the room without an end
   if (gethostname(name.data(), name.size() - 1) != 0 || name[0] == '\0') return std::nullopt;
   return std::string(name.data(), std::min(std::strlen(name.data()), kLongestComputerName));
+}
+
+// Every log record has it.
+std::optional<std::string> ComputerName() {
+  static const std::optional<std::string> name = ReadComputerName();
+  return name;
 }
 
 std::string ProgramPath() {

@@ -8,8 +8,10 @@
 #include <algorithm>
 #include <cerrno>
 #include <cstdio>
+#include <filesystem>
 #include <limits>
 #include <string_view>
+#include <system_error>
 #include <utility>
 
 #include "platform/posix_calls.h"
@@ -348,6 +350,13 @@ bool PosixFiles::Exists(const std::string& path) {
   if (path.find('\0') != std::string::npos) return false;
   struct stat status {};
   return stat(NativePath(path).c_str(), &status) == 0 && !S_ISDIR(status.st_mode);
+}
+
+std::string PosixFiles::FullName(const std::string& path) {
+  std::error_code failure;
+  const std::string native = NativePath(path);
+  const std::filesystem::path full = std::filesystem::absolute(native, failure);
+  return failure ? native : full.string();
 }
 
 std::unique_ptr<InputFile> PosixFiles::OpenInput(const std::string& path, Share share) {

@@ -20,6 +20,7 @@ class PosixFiles : public Files {
   std::uint64_t Length(const std::string& path) override;
   // True for anything but a folder.
   bool Exists(const std::string& path) override;
+  std::string FullName(const std::string& path) override;
   std::unique_ptr<InputFile> OpenInput(const std::string& path, Share share) override;
   std::unique_ptr<OutputFile> OpenOutput(const std::string& path, OutputMode mode) override;
   // Removes the name also while a program holds the file.

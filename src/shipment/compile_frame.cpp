@@ -52,9 +52,11 @@ std::int32_t CompileFrame::Load(const std::string& a_sFileName, RowTable& a_vtRo
     output_ = a_sFileName;
     rows_.clear();
     waiting_.clear();
-    const auto tell = [&](std::string_view told) { WriteLog(kWarning, "Load", told); };
-    TakeUpInterrupted(output_, tell);
-    if (inventoryOn_) TakeUpInterrupted(inventoryPath_, tell);
+    PendingNotice interrupted;
+    interrupted.VendorId = Document().VendorId;
+    interrupted.PartnerId = Document().PartnerId;
+    TakeUpInterrupted(PendingNotice::kByVendorAndPartner, interrupted,
+                      [&](std::string_view told) { WriteLog(kWarning, "Load", told); });
     Host().PackListMode = 0;
     const PackPointers packs = Try([&] { return Host().PacksToCompile(Document().VendorId, Document().PartnerId); });
     if (packs.empty()) {
@@ -118,27 +120,30 @@ ASN CompileFrame::AsnOf(const Pack& pack) {
   return asn;
 }
 
-// A run that was killed while it wrote a notice left a note. Once the notice is stored, that is all there is to it;
-// else it goes from the file, for its packs still wait. The note stays when that can't be told or done.
-void CompileFrame::TakeUpInterrupted(const std::string& name, const std::function<void(std::string_view)>& tell) {
-  NoticeFiles files(FileSystem());
-  const auto pending = Try([&] { return files.FindPending(name); });
-  if (!pending) return;
-  const bool dealtWith = Try([&] {
-    if (pending->path.empty() || IsStored(pending->id) || !files.TakeBack(*pending)) return;
-    tell("Notice " + pending->id.ASNNo + " of an interrupted run was never stored and is taken out of " +
-         pending->path);
-  });
-  if (dealtWith) Try([&] { files.Forget(name); });
+// What a killed run left: a notice that is written, in full or in part, and not stored, so that its packs still wait.
+// While a file can't be cut back the record of it stays.
+void CompileFrame::TakeUpInterrupted(const Lookup& lookup, const PendingNotice& probe, const Tell& tell) {
+  const auto pending = Try([&] { return Select(Records(), lookup, probe); });
+  for (const auto& notice : pending) Try([&] { TakeBack(*notice, tell); });
 }
 
-// Whoever the partner: several documents may write to one file.
-bool CompileFrame::IsStored(const NoticeId& id) {
-  ASN probe;
-  probe.ShipmentId = id.shipmentId;
-  return std::ranges::any_of(Select(Records(), ASN::kByShipment, probe), [&](const auto& asn) {
-    return asn->OrderId == id.orderId && Str(asn->ASNNo) == id.ASNNo;
-  });
+void CompileFrame::TakeBack(const PendingNotice& notice, const Tell& tell) {
+  const FileGrowth growth = {notice.FileName, notice.NewFile, static_cast<std::uint64_t>(notice.LengthBefore),
+                             static_cast<std::uint64_t>(notice.LengthAdded)};
+  const auto done = NoticeFiles::TakeBack(FileSystem(), growth);
+  if (done == NoticeFiles::TakenBack::kInUse) return;
+  Forget(notice);
+  const std::string what = "Notice " + notice.ASNNo + " of an interrupted run was never stored";
+  if (done == NoticeFiles::TakenBack::kCutBack) tell(what + " and is taken out of " + notice.FileName);
+  if (done == NoticeFiles::TakenBack::kChanged) {
+    tell(what + ", and " + notice.FileName + " has changed since: look whether the partner got that notice");
+  }
+}
+
+// Another program may have been quicker.
+void CompileFrame::Forget(const PendingNotice& notice) {
+  if (!partnerkit::Delete(Records(), notice) && Records().NativeError() != 0)
+    RaiseStore(*this, "A notice stays pending");
 }
 
 std::int32_t CompileFrame::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
@@ -149,14 +154,7 @@ std::int32_t CompileFrame::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog
     const RowKey key{notice.asn.ShipmentId, notice.asn.OrderId, std::string(Str(notice.asn.ShipToCode))};
     if (const auto waiting = waiting_.find(key); waiting != waiting_.end()) notice.packs = waiting->second;
     if (notice.packs.empty()) return notice.log.Note(kRejection, "No Packs found to process.");
-    bool compiled = false;
-    try {
-      compiled = Compile(notice);
-    } catch (...) {
-      LogPacks(notice);
-      throw;
-    }
-    if (!compiled) return;
+    if (!(Prepare(notice) && Make(notice) && WriteFiles(notice) && Stamp(notice))) return;
     TakeOut(key);
     RunCarrier(notice);
     if (RunExtension(notice) && FollowOn(notice)) id = notice.asn.Id;
@@ -164,40 +162,68 @@ std::int32_t CompileFrame::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog
   });
 }
 
-bool CompileFrame::Compile(Notice& notice) {
-  return Prepare(notice) && Number(notice) && OpenOutput(notice) && MakeNotice(notice) && WriteFiles(notice) &&
-         Stamp(notice);
-}
-
-// Of one state of the store. Hundreds of reads that each ask for it by themselves cost a store noticeably more, too.
-bool CompileFrame::MakeNotice(Notice& notice) {
-  const bool begun = Try([&] { Host().BeginTrans(); });
+// In memory, of one state of the store. The number, and what the files are to be cut back to should the program be
+// killed, are durable before the first byte is written, in one wait for the disk.
+bool CompileFrame::Make(Notice& notice) {
+  const std::size_t told = notice.log.Ids().size();
+  if (!Try([&] { Host().BeginTrans(); })) return false;
   try {
-    const bool made = WriteNotice(notice);
-    if (begun) Try([&] { Host().CommitTrans(); });
-    return made;
+    const bool made = Number(notice) && OpenOutput(notice) && WriteNotice(notice) && NotePending(notice);
+    if (Try([&] { Host().CommitTrans(); })) return made;
   } catch (...) {
-    if (begun) Try([&] { Host().RollbackTrans(); });
+    // What was told until then stays.
+    const HandlerOff off(Errors());
+    for (const PendingNotice& pending : notice.pending) Try([&] { Forget(pending); });
+    if (!Try([&] { Host().CommitTrans(); })) notice.log.Ids().resize(told);
     throw;
   }
+  notice.log.Ids().resize(told);
+  return false;
+}
+
+bool CompileFrame::NotePending(Notice& notice) {
+  for (const FileGrowth& growth : notice.files.Growths()) {
+    PendingNotice& pending = notice.pending.emplace_back();
+    pending.VendorId = notice.asn.VendorId;
+    pending.PartnerId = notice.asn.PartnerId;
+    pending.ASNNo = Str(notice.asn.ASNNo);
+    pending.FileName = FileSystem().FullName(growth.path);
+    pending.NewFile = growth.isNew;
+    pending.LengthBefore = static_cast<std::int64_t>(growth.before);
+    pending.LengthAdded = static_cast<std::int64_t>(growth.added);
+    const bool noted = Try([&] {
+      if (!Add(Records(), pending)) RaiseStore(*this, "The notice cannot be noted as pending");
+      return true;
+    });
+    if (!noted) return false;
+  }
+  return true;
 }
 
 // The file's number among the notice's files; nothing, with the cause in ErrorNumber, when it can't be opened.
-std::optional<std::size_t> CompileFrame::OpenFile(Notice& notice, const std::string& name, const std::string& path) {
-  bool begun = false;
-  // Another program may have been interrupted since the listing.
-  for (int attempt = 0; attempt < 2 && !begun; ++attempt) {
-    if (attempt > 0) TakeUpInterrupted(name, [&](std::string_view told) { notice.log.Note(kWarning, told); });
-    if (!Try([&] { begun = notice.files.Begin(name); })) return std::nullopt;
-  }
-  if (!begun) return std::nullopt;
-  return Try([&] { return std::optional(notice.files.Open(path)); });
+std::optional<std::size_t> CompileFrame::OpenFile(Notice& notice, const std::string& path) {
+  PendingNotice interrupted;
+  interrupted.FileName = FileSystem().FullName(path);
+  // No other program writes to a file that is open here. One that had it before may have been killed, though.
+  const auto open = [&] { return Try([&] { return std::optional(notice.files.Open(path)); }); };
+  const auto isWhole = [&] {
+    return Try([&] { return Count(Records(), PendingNotice::kByFileName, interrupted) == 0; });
+  };
+  auto file = open();
+  if (!file || isWhole()) return file;
+  Try([&] { notice.files.LetGo(); });
+  TakeUpInterrupted(PendingNotice::kByFileName, interrupted,
+                    [&](std::string_view told) { notice.log.Note(kWarning, told); });
+  file = open();
+  if (!file || isWhole()) return file;
+  Try([&] { throw RunTimeError(run_time::kPermissionDenied, "An interrupted notice cannot be taken out of " + path); });
+  return std::nullopt;
 }
 
 bool CompileFrame::Prepare(Notice& notice) {
   if (!inventoryOn_) return true;
   const HandlerOff off(Errors());
-  const auto file = OpenFile(notice, inventoryPath_, inventoryPath_);
+  const auto file = OpenFile(notice, inventoryPath_);
   if (!file) {
     notice.log.Note(ErrorNumber(), "Open Inventory File", std::string(compile_.inventoryFailed) + inventoryPath_);
     return false;
@@ -210,8 +236,9 @@ bool CompileFrame::Number(Notice& notice) { return NumberFrom(notice, *notice.pa
 
 bool CompileFrame::NumberFrom(Notice& notice, const Pack& first) {
   if (!TradingPartner().ASNNoFromInvoice || !first.InvoiceNo) {
-    notice.asn.ASNNo =
-        std::to_string(Try([&] { return Host().NextNumber(TradingPartner().PartnerId, Counter::kASNNo); }));
+    std::int32_t number = 0;
+    if (!Try([&] { number = Host().NextNumber(TradingPartner().PartnerId, Counter::kASNNo); })) return false;
+    notice.asn.ASNNo = std::to_string(number);
     return true;
   }
   notice.asn.ASNNo = first.InvoiceNo;
@@ -228,7 +255,7 @@ bool CompileFrame::OpenOutput(Notice& notice) {
     else path += c;
   }
   const HandlerOff off(Errors());
-  const auto file = OpenFile(notice, output_, path);
+  const auto file = OpenFile(notice, path);
   if (!file) {
     notice.log.Note(ErrorNumber(), "Open ASN File", "Cannot open file " + path);
     return false;
@@ -239,13 +266,19 @@ bool CompileFrame::OpenOutput(Notice& notice) {
 
 bool CompileFrame::WriteFiles(Notice& notice) {
   try {
-    notice.files.Write({*notice.asn.ASNNo, notice.asn.ShipmentId, notice.asn.OrderId});
+    notice.files.Write();
     return true;
   } catch (const RunTimeError& error) {
-    LogPacks(notice);
+    GiveUp(notice);
     notice.log.Note(error.Number(), "Process", "Cannot write ASN " + *notice.asn.ASNNo + ": " + error.Description());
     return false;
   }
+}
+
+// A file that can't be cut back now is by the next run.
+void CompileFrame::GiveUp(Notice& notice) {
+  if (!notice.files.Abandon()) return;
+  for (const PendingNotice& pending : notice.pending) Try([&] { Forget(pending); });
 }
 
 bool CompileFrame::Stamp(Notice& notice) {
@@ -258,14 +291,12 @@ bool CompileFrame::Stamp(Notice& notice) {
     // A record written meanwhile went with the transaction.
     notice.log.Ids().resize(told);
     notice.asn.Id = 0;
-    notice.files.Abandon();
-    LogPacks(notice);
+    GiveUp(notice);
     notice.log.Note(error.Number(), "Process",
                     "ASN " + *notice.asn.ASNNo +
                         " was written but not stored, and is taken out of its files again: " + error.Description());
     return false;
   }
-  notice.packsTold.clear();
   for (const auto& pack : notice.packs) {
     pack->ASNId = notice.asn.Id;
     pack->Status = kCompiled;
@@ -287,18 +318,9 @@ void CompileFrame::StampInTransaction(Notice& notice) {
     shipment.Status = kCompiled;
     if (!Update(Records(), shipment)) RaiseStore(*this, "The shipment cannot be stamped");
   }
-  LogEach(notice);
+  for (const PendingNotice& pending : notice.pending) Forget(pending);
   if (!compile_.tellsLast) TellCompiled(notice);
   Host().CommitTrans();
-}
-
-void CompileFrame::LogEach(Notice& notice) {
-  for (const std::string& told : notice.packsTold) notice.log.Note(kInformation, "Process Pack", told);
-}
-
-void CompileFrame::LogPacks(Notice& notice) {
-  LogEach(notice);
-  notice.packsTold.clear();
 }
 
 void CompileFrame::TellCompiled(Notice& notice) {

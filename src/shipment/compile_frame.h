@@ -3,7 +3,8 @@
 //
 // The story of a row: its packs are the waiting ones of one shipment and one order. The first of them decides the
 // notice's number; the notice is made in memory and added to its files as a whole; then the notice is stored and the
-// packs are stamped, in one transaction. What fails before that leaves packs and files as they were.
+// packs are stamped, in one transaction. What fails before that leaves packs and files as they were; so does a kill, as
+// soon as the next run has taken it up.
 #pragma once
 
 #include <cstdint>
@@ -59,7 +60,7 @@ class CompileFrame : public TranslatorBase {
     CallLog log;
     NoticeFiles files;
     std::size_t output = 0, inventory = 0;  // their numbers in `files`
-    std::vector<std::string> packsTold;     // what is still to be logged of the packs
+    std::vector<PendingNotice> pending;     // what the store says of them while they are written
   };
 
   // --- The steps of a row, in their order. False ends it, with the reason noted.
@@ -72,8 +73,6 @@ class CompileFrame : public TranslatorBase {
   virtual bool FollowOn(Notice&) { return true; }
 
   // --- What the steps are made of
-  // Logs the packs told so far. They wait for the stamping, so that one wait for the disk does for both.
-  void LogPacks(Notice& notice);
   // The pack's invoice number if the partner's notices bear it, else the next number of the partner's.
   bool NumberFrom(Notice& notice, const Pack& first);
   // Papers that this version doesn't make yet: the notice stands, and its row says so.
@@ -90,24 +89,25 @@ class CompileFrame : public TranslatorBase {
 
  private:
   using RowKey = std::tuple<std::int32_t, std::int32_t, std::string>;
+  using Tell = std::function<void(std::string_view)>;
 
   RowKey KeyOf(const Pack& pack) const;
   ASN AsnOf(const Pack& pack);
   void ListPacks(const PackPointers& packs, RowTable& rows);
-  // `name` is a file's as it is configured, with its "*".
-  void TakeUpInterrupted(const std::string& name, const std::function<void(std::string_view)>& tell);
-  std::optional<std::size_t> OpenFile(Notice& notice, const std::string& name, const std::string& path);
-  bool IsStored(const NoticeId& id);
-  bool MakeNotice(Notice& notice);
+  void TakeUpInterrupted(const Lookup& lookup, const PendingNotice& probe, const Tell& tell);
+  void TakeBack(const PendingNotice& notice, const Tell& tell);
+  void Forget(const PendingNotice& notice);
+  std::optional<std::size_t> OpenFile(Notice& notice, const std::string& path);
+  bool Make(Notice& notice);
+  bool NotePending(Notice& notice);
   bool WriteFiles(Notice& notice);
+  void GiveUp(Notice& notice);
   bool Stamp(Notice& notice);
   void StampInTransaction(Notice& notice);
-  void LogEach(Notice& notice);
   void TellCompiled(Notice& notice);
   void TakeOut(const RowKey& key);
   void RunCarrier(Notice& notice);
   bool RunExtension(Notice& notice);
-  bool Compile(Notice& notice);
 
   CompileValues compile_;
   std::string output_;

@@ -50,11 +50,10 @@ void NoticeRecords::SetNotice(const ASN& asn, Text firstInvoiceNo) {
   slips_.clear();
   jobs_.clear();
   locns_.clear();
-  orderLines_.clear();
+  orderLines_ = {};
   slipLines_.clear();
-  locnLines_.clear();
+  locnLines_ = {};
   slipsFetched_.clear();
-  locnLinesAsked_ = 0;
   types_.clear();
   products_.clear();
 }
@@ -127,20 +126,22 @@ const PSlipLine& NoticeRecords::SlipLine() {
 }
 
 // A notice of a few cartons of a long order does without most of the order's lines.
-const OrderLocnLine& NoticeRecords::LocnLine() {
+template <class R>
+const R& NoticeRecords::OfOrder(Ordered<R>& lines, std::int32_t id, std::int32_t R::*member) {
   constexpr int kFew = 8;
-  if (locnLine_ == nullptr) {
-    const std::int32_t id = SlipLine().OrderLocnLineId;
-    if (!locnLines_.contains(id) && ++locnLinesAsked_ == kFew) {
-      OrderLocnLine probe;
-      probe.OrderId = order_.OrderId;
-      Fetch(locnLines_, OrderLocnLine::kByOrder, probe, &OrderLocnLine::Id);
-    }
-    locnLine_ = &Kept(locnLines_, id, &OrderLocnLine::Id);
+  if (!lines.kept.contains(id) && ++lines.asked == kFew) {
+    R probe;
+    probe.OrderId = order_.OrderId;
+    Fetch(lines.kept, R::kByOrder, probe, member);
   }
+  return Kept(lines.kept, id, member);
+}
+
+const OrderLocnLine& NoticeRecords::LocnLine() {
+  if (locnLine_ == nullptr) locnLine_ = &OfOrder(locnLines_, SlipLine().OrderLocnLineId, &OrderLocnLine::Id);
   return *locnLine_;
 }
 
-const OrderLine& NoticeRecords::OrderedLine() { return Kept(orderLines_, LocnLine().LineId, &OrderLine::LineId); }
+const OrderLine& NoticeRecords::OrderedLine() { return OfOrder(orderLines_, LocnLine().LineId, &OrderLine::LineId); }
 
 }  // namespace partnerkit::shipment

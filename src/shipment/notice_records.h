@@ -58,12 +58,21 @@ class NoticeRecords {
   const Product* OrderedProduct();
 
  private:
+  // Lines of the order by their ids, and how many had to be asked for.
+  template <class R>
+  struct Ordered {
+    std::unordered_map<std::int32_t, R> kept;
+    int asked = 0;
+  };
+
   template <class R>
   bool Read(R& record);
   template <class R, class K>
   const R& Kept(std::unordered_map<K, R>& kept, const K& key, K R::*member);
   template <class R>
   void Fetch(std::unordered_map<std::int32_t, R>& into, const Lookup& lookup, const R& probe, std::int32_t R::*id);
+  template <class R>
+  const R& OfOrder(Ordered<R>& lines, std::int32_t id, std::int32_t R::*member);
   const PSlip& Slip();
   const Product* FindProduct(const std::string& number);
 
@@ -78,13 +87,12 @@ class NoticeRecords {
   std::unordered_map<std::int32_t, PSlip> slips_;
   std::unordered_map<std::int32_t, Job> jobs_;
   std::unordered_map<std::int32_t, OrderLocn> locns_;
-  std::unordered_map<std::int32_t, OrderLine> orderLines_;
   std::unordered_map<std::string, PackType> types_;
   std::unordered_map<std::string, std::optional<Product>> products_;
   std::unordered_map<std::int32_t, PSlipLine> slipLines_;
-  std::unordered_map<std::int32_t, OrderLocnLine> locnLines_;
+  Ordered<OrderLine> orderLines_;
+  Ordered<OrderLocnLine> locnLines_;
   std::unordered_set<std::int32_t> slipsFetched_;
-  int locnLinesAsked_ = 0;
   const PSlipLine* slipLine_ = nullptr;
   const OrderLocnLine* locnLine_ = nullptr;
 };

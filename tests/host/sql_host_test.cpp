@@ -105,11 +105,20 @@ TEST_F(SqlHostTest, GivesNoNumberThatCouldComeAgain) {
   EXPECT_EQ(ErrorOf([&] { host_->NextNumber("MGB", Counter::kASNNo); }), usedUp);
   EXPECT_EQ(ErrorOf([&] { host_->NextNumber("MGB", Counter::kASNNo); }), usedUp);
   EXPECT_EQ(ErrorOf([&] { host_->NextNumber("XYZ", Counter::kGroupNo); }), Path() + ": there is no partner \"XYZ\"");
+}
+
+TEST_F(SqlHostTest, TakesANumberBackWithTheTransactionItWasGivenIn) {
+  AddPartner("MGB", 41);
   host_->BeginTrans();
-  EXPECT_EQ(ErrorOf([&] { host_->NextNumber("MGB", Counter::kGroupNo); }), Path() + ": a transaction is open already");
-  AddLog("still open");
+  EXPECT_EQ(host_->NextNumber("MGB", Counter::kASNNo), 42);
+  EXPECT_NE(ErrorOf([&] { host_->NextNumber("XYZ", Counter::kASNNo); }), "");
+  EXPECT_EQ(host_->NextNumber("MGB", Counter::kASNNo), 43);
+  host_->RollbackTrans();
+  host_->BeginTrans();
+  EXPECT_EQ(host_->NextNumber("MGB", Counter::kASNNo), 42);
+  EXPECT_EQ(Ask(Path(), "SELECT LastASNNo FROM tbPartner"), "41");
   host_->CommitTrans();
-  EXPECT_EQ(host_->NextNumber("MGB", Counter::kGroupNo), 1);
+  EXPECT_EQ(Ask(Path(), "SELECT LastASNNo FROM tbPartner"), "42");
 }
 
 TEST_F(SqlHostTest, DoesNotLetAnOldRecordTakeCountersBack) {

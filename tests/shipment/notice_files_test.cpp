@@ -14,6 +14,9 @@ using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using Texts = std::vector<std::string>;
 
+constexpr const char* kTakenOut =
+    "W Load: Notice 1001 of an interrupted run was never stored and is taken out of FOLDERout/asn.csv";
+
 // One pack, an inventory file and an output that was there before.
 struct FiledTrade : PackedTrade {
   FiledTrade() : PackedTrade(kMgb), faulty(*ports.files) {
@@ -22,6 +25,13 @@ struct FiledTrade : PackedTrade {
     Sql("UPDATE tbPartner SET ASNExtension = 'TL2Compatible', InventoryFile = '" + folder / "out/stock" + "'");
     folder.Write("out/asn.csv", "EARLIER\r\n");
     AddPack();
+  }
+  // What the store says of notices in the making.
+  int Pending() {
+    int pending = 0;
+    PendingNotice notice;
+    system->Records().ForEach(PendingNotice::kType, &notice, [&] { ++pending; });
+    return pending;
   }
   std::string Path(std::string text) const {
     const std::size_t at = text.find("FOLDER");
@@ -39,18 +49,13 @@ struct Fault {
 };
 
 const Fault kFaults[] = {
-    {"OpenOutput", "stock.pending", 0, "61 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
-    {"OpenOutput", "stock.pending", 1, "61 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
-    {"Write", "stock.pending", 0, "61 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
-    {"OpenOutput", "out/stock", 0, "61 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
-    {"OpenOutput", "asn.csv.pending", 0, "61 Open ASN File: Cannot open file FOLDERout/asn.csv"},
+    {"Length", "out/stock", 0, "61 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
+    {"OpenOutput", "stock.new", 0, "61 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
     {"OpenOutput", "asn.csv", 0, "61 Open ASN File: Cannot open file FOLDERout/asn.csv"},
-    {"Write", "stock.pending", 1, "61 Process: Cannot write ASN 1001: It failed: stock.pending"},
-    {"Sync", "stock.pending", 0, "61 Process: Cannot write ASN 1001: It failed: stock.pending"},
-    {"Write", "asn.csv.pending", 0, "61 Process: Cannot write ASN 1001: It failed: asn.csv.pending"},
-    {"Sync", "asn.csv.pending", 0, "61 Process: Cannot write ASN 1001: It failed: asn.csv.pending"},
-    {"Write", "out/stock", 0, "61 Process: Cannot write ASN 1001: It failed: out/stock"},
-    {"Sync", "out/stock", 0, "61 Process: Cannot write ASN 1001: It failed: out/stock"},
+    {"Length", "out/stock", 1, "61 Process: Cannot write ASN 1001: It failed: out/stock"},
+    {"Rename", "out/stock", 0, "61 Process: Cannot write ASN 1001: It failed: out/stock"},
+    {"Write", "stock.new", 0, "61 Process: Cannot write ASN 1001: It failed: stock.new"},
+    {"Sync", "stock.new", 0, "61 Process: Cannot write ASN 1001: It failed: stock.new"},
     {"Write", "asn.csv", 0, "61 Process: Cannot write ASN 1001: It failed: asn.csv"},
     {"Sync", "asn.csv", 0, "61 Process: Cannot write ASN 1001: It failed: asn.csv"},
 };
@@ -68,9 +73,8 @@ TEST(NoticeFilesTest, AreAsTheyWereWhenTheDiskIsFullAtAnyOperation) {
     EXPECT_THAT(trade.reports, IsEmpty());
     EXPECT_EQ(trade.Stamps(), "0/4");
     EXPECT_THAT(trade.Output(), ElementsAre("EARLIER"));
-    // A note that could not be opened anew is another program's, for all that is known.
-    EXPECT_EQ(trade.Files(),
-              fault.what == std::string("OpenOutput") && fault.passed == 1 ? "asn.csv stock.pending" : "asn.csv");
+    EXPECT_EQ(trade.Files(), "asn.csv");
+    EXPECT_EQ(trade.Pending(), 0);
     EXPECT_EQ(trade.Process(*translator).result, 1);
     EXPECT_EQ(trade.Files(), "asn.csv stock");
     EXPECT_EQ(trade.Output().size(), 2U);
@@ -78,7 +82,7 @@ TEST(NoticeFilesTest, AreAsTheyWereWhenTheDiskIsFullAtAnyOperation) {
   }
 }
 
-// Not even the way back is open: the note stays, and the next run goes it.
+// Not even the way back is open: the next run goes it.
 TEST(NoticeFilesTest, AreCutBackByTheNextRunWhenTheyCannotBeAtOnce) {
   FiledTrade trade;
   const auto translator = trade.Loaded();
@@ -86,124 +90,128 @@ TEST(NoticeFilesTest, AreCutBackByTheNextRunWhenTheyCannotBeAtOnce) {
   trade.faulty.Fail("Truncate", "asn.csv", run_time::kDeviceError);
   EXPECT_EQ(trade.Process(*translator).result, 0);
   EXPECT_THAT(trade.Output(), ElementsAre("EARLIER", "SSCC1,1001,"));
-  EXPECT_EQ(trade.Files(), "asn.csv asn.csv.pending");
+  EXPECT_EQ(trade.Files(), "asn.csv");
   translator->Term();
   trade.Sql("UPDATE tbPack SET Status = 4");
   EXPECT_EQ(trade.Run().front().result, 1);
-  EXPECT_THAT(trade.NewLog(), Contains(trade.Path("W Load: Notice 1001 of an interrupted run was never stored and is "
-                                                  "taken out of FOLDERout/asn.csv")));
+  EXPECT_THAT(trade.NewLog(), Contains(trade.Path(kTakenOut)));
   EXPECT_THAT(trade.Output(), ElementsAre("EARLIER", "SSCC1,1002,"));
-  EXPECT_EQ(trade.Files(), "asn.csv stock");
-}
-
-TEST(NoticeFilesTest, StayWithTheNoticeWhoseNoteCannotBeDeleted) {
-  FiledTrade trade;
-  trade.faulty.Fail("Delete", "asn.csv.pending", run_time::kPermissionDenied);
-  EXPECT_EQ(trade.Run().front().result, 1);
-  EXPECT_EQ(trade.Files(), "asn.csv asn.csv.pending stock");
-  EXPECT_THAT(trade.reports, IsEmpty());
-  trade.Loaded();
-  EXPECT_EQ(trade.Files(), "asn.csv stock");
-  EXPECT_THAT(trade.Output(), ElementsAre("EARLIER", "SSCC1,1001,"));
+  EXPECT_EQ(trade.Pending(), 0);
 }
 
 // --- After a killed run
 
+enum Told { kNothing, kOut, kSeen };
+
 struct Killed {
   const char* what;
-  std::string note;  // beside the output
-  std::string file;  // the output; "-" for none
-  std::string sql;
-  std::string left;  // of it
-  bool told;
+  const char* growth;  // NewFile, LengthBefore, LengthAdded
+  std::string file;    // the output; "-" for none
+  std::string left;    // of it
+  Told told;
 };
 
-const std::string kGrown = "partnerkit notice 1\nFOLDERout/asn.csv\ngrown\n1001\n1\n1\n9\n13\nend\n";
-const std::string kNew = "partnerkit notice 1\nFOLDERout/asn.csv\nnew\n1001\n1\n1\n0\n13\nend\n";
+constexpr const char* kGrown = "0, 9, 13";
+constexpr const char* kMade = "1, 0, 13";
 const std::string kEarlier = "EARLIER\r\n", kNotice = "SSCC1,1001,\r\n";
-const std::string kStored = "INSERT INTO tbASN(PartnerId, ASNNo, ShipmentId, OrderId) VALUES('MGB', '1001', 1, 1)";
 
 const Killed kKilled[] = {
-    {"before the file grew", kGrown, kEarlier, "", kEarlier, false},
-    {"in the midst of it", kGrown, kEarlier + "SSCC1", "", kEarlier, true},
-    {"behind it", kGrown, kEarlier + kNotice, "", kEarlier, true},
-    {"behind the storing", kGrown, kEarlier + kNotice, kStored, kEarlier + kNotice, false},
-    {"behind the storing, for another partner", kGrown, kEarlier + kNotice,
-     "INSERT INTO tbASN(PartnerId, ASNNo, ShipmentId, OrderId) VALUES('TOYS', '1001', 1, 1)", kEarlier + kNotice,
-     false},
-    {"with its number used elsewhere", kGrown, kEarlier + kNotice,
-     "INSERT INTO tbASN(PartnerId, ASNNo, ShipmentId, OrderId) VALUES('MGB', '1001', 1, 2), ('MGB', '1002', 1, 1)",
-     kEarlier, true},
-    {"and the file has grown since", kGrown, kEarlier + kNotice + "more", "", kEarlier + kNotice + "more", false},
-    {"and the file is shorter than it was", kGrown, "EARL", "", "EARL", false},
-    {"and the file is gone", kGrown, "-", "", "-", false},
-    {"with a new file", kNew, "", "", "-", false},
-    {"with a new file begun", kNew, "SSCC1", "", "-", true},
-    {"with a new file not begun", kNew.substr(0, kNew.find("1001")), "", "", "-", false},
-    {"with a new file that somebody filled", kNew.substr(0, kNew.find("1001")), "theirs", "", "theirs", false},
+    {"before the file grew", kGrown, kEarlier, kEarlier, kNothing},
+    {"in the midst of it", kGrown, kEarlier + "SSCC1", kEarlier, kOut},
+    {"behind it", kGrown, kEarlier + kNotice, kEarlier, kOut},
+    {"and the file has grown since", kGrown, kEarlier + kNotice + "more", kEarlier + kNotice + "more", kSeen},
+    {"and the file is shorter than it was", kGrown, "EARL", "EARL", kSeen},
+    {"and the file is gone", kGrown, "-", "-", kSeen},
+    {"with a file that was there empty", "0, 0, 13", "", "", kNothing},
+    {"with a new file", kMade, "", "-", kNothing},
+    {"with a new file begun", kMade, "SSCC1", "-", kOut},
+    {"with a new file that somebody filled", kMade, kNotice + "theirs", kNotice + "theirs", kSeen},
+    {"with a new file that is gone", kMade, "-", "-", kSeen},
+};
+
+struct KilledTrade : FiledTrade {
+  KilledTrade(const std::string& growth, const std::string& file, const char* partner = "MGB") {
+    Sql(Path("INSERT INTO tbPendingNotice(VendorId, PartnerId, ASNNo, FileName, NewFile, LengthBefore, LengthAdded) "
+             "VALUES('ACME', '") +
+        partner + Path("', '1001', 'FOLDERout/asn.csv', ") + growth + ")");
+    folder.Write("out/asn.csv", file);
+    if (file == "-") std::filesystem::remove(folder / "out/asn.csv");
+  }
 };
 
 TEST(NoticeFilesTest, AreTakenUpAfterAKilledRun) {
   for (const Killed& killed : kKilled) {
     SCOPED_TRACE(killed.what);
-    FiledTrade trade;
-    trade.folder.Write("out/asn.csv.pending", trade.Path(killed.note));
-    trade.folder.Write("out/asn.csv", killed.file);
-    if (killed.file == "-") std::filesystem::remove(trade.folder / "out/asn.csv");
-    trade.Sql(killed.sql);
+    KilledTrade trade(killed.growth, killed.file);
     trade.Loaded();
     EXPECT_EQ(trade.folder.Has("out/asn.csv") ? trade.folder.Read("out/asn.csv") : "-", killed.left);
-    EXPECT_FALSE(trade.folder.Has("out/asn.csv.pending"));
-    const Texts told = {
-        trade.Path("W Load: Notice 1001 of an interrupted run was never stored and is taken out of "
-                   "FOLDERout/asn.csv")};
-    EXPECT_EQ(trade.NewLog(), killed.told ? told : Texts{});
+    EXPECT_EQ(trade.Pending(), 0);
+    const Texts told[] = {
+        {},
+        {trade.Path(kTakenOut)},
+        {trade.Path("W Load: Notice 1001 of an interrupted run was never stored, and "
+                    "FOLDERout/asn.csv has changed since: look whether the partner got that notice")}};
+    EXPECT_EQ(trade.NewLog(), told[killed.told]);
   }
 }
 
-// A note is on the disk before anything else is.
-TEST(NoticeFilesTest, AreLeftAloneByANoteThatIsTorn) {
-  for (const std::string& note : {kGrown, kNew}) {
-    for (std::size_t length = 0; length + 4 < note.size(); ++length) {
-      SCOPED_TRACE(note.substr(0, length));
-      FiledTrade trade;
-      const std::string whole = trade.Path(note);
-      trade.folder.Write("out/asn.csv.pending", whole.substr(0, std::min(length, whole.size() - 4)));
-      trade.folder.Write("out/asn.csv", kEarlier + kNotice);
-      trade.Loaded();
-      EXPECT_EQ(trade.folder.Read("out/asn.csv"), kEarlier + kNotice);
-      EXPECT_EQ(trade.Files(), "asn.csv");
-      EXPECT_THAT(trade.NewLog(), IsEmpty());
-    }
-  }
-}
-
-TEST(NoticeFilesTest, AreTakenUpByARowToo) {
+// A workspace may be entered from any folder.
+TEST(NoticeFilesTest, AreFoundAgainFromAnotherFolder) {
   FiledTrade trade;
+  const auto relative = std::filesystem::relative(trade.folder / "out/asn.csv").string();
+  const auto before = std::filesystem::current_path();
   const auto translator = trade.Loaded();
-  trade.folder.Write("out/asn.csv.pending", trade.Path(kGrown));
-  trade.folder.Write("out/asn.csv", kEarlier + kNotice);
+  RowTable rows;
+  ASSERT_EQ(translator->Load(relative, rows), 1);
+  trade.Sql("UPDATE tbPack SET Status = 8");
+  trade.faulty.Fail("Truncate", "asn.csv", run_time::kDeviceError);
+  EXPECT_EQ(trade.Process(*translator).result, 0);
+  std::filesystem::current_path("/");
+  trade.Loaded();
+  std::filesystem::current_path(before);
+  EXPECT_THAT(trade.Output(), ElementsAre("EARLIER"));
+}
+
+// Before it had its name.
+TEST(NoticeFilesTest, LeaveNoNewFileBehindAKilledRun) {
+  KilledTrade trade(kMade, "-");
+  trade.folder.Write("out/asn.csv.new", "");
+  trade.Loaded();
+  EXPECT_EQ(trade.Files() + std::to_string(trade.Pending()), "0");
+  EXPECT_THAT(trade.NewLog(), IsEmpty());
+  // Killed even earlier.
+  trade.folder.Write("out/asn.csv.new", "");
+  trade.folder.Write("out/stock.new", "");
+  EXPECT_EQ(trade.Run().front().result, 1);
+  EXPECT_EQ(trade.Files(), "asn.csv stock");
+}
+
+// Another partner's notice, of a document that writes to the same file.
+TEST(NoticeFilesTest, AreTakenUpByARowToo) {
+  KilledTrade trade(kGrown, kEarlier + kNotice, "TOYS");
   trade.Sql("UPDATE tbPartner SET LastASNNo = 1001");
+  const auto translator = trade.Loaded();
+  EXPECT_THAT(trade.Output(), ElementsAre("EARLIER", "SSCC1,1001,"));
   const auto outcome = trade.Process(*translator);
-  EXPECT_THAT(outcome.told.front(), trade.Path("W Process: Notice 1001 of an interrupted run was never stored and is "
-                                               "taken out of FOLDERout/asn.csv"));
+  EXPECT_EQ(outcome.told.front(), trade.Path("W Process: Notice 1001 of an interrupted run was never stored and is "
+                                             "taken out of FOLDERout/asn.csv"));
   EXPECT_EQ(outcome.result, 1);
   EXPECT_THAT(trade.Output(), ElementsAre("EARLIER", "SSCC1,1002,"));
-  EXPECT_EQ(trade.Files(), "asn.csv stock");
+  EXPECT_EQ(trade.Pending(), 0);
 }
 
-TEST(NoticeFilesTest, KeepTheNoteWhileTheyCannotBeTakenUp) {
-  FiledTrade trade;
+TEST(NoticeFilesTest, TurnRowsAwayWhileTheyCannotBeTakenUp) {
+  KilledTrade trade(kGrown, kEarlier + kNotice);
   trade.answer = Button::kIgnore;
-  trade.folder.Write("out/asn.csv.pending", trade.Path(kGrown));
-  trade.folder.Write("out/asn.csv", kEarlier + kNotice);
-  trade.faulty.Fail("Truncate", "asn.csv", run_time::kDeviceError);
-  trade.Loaded();
+  trade.faulty.Fail("Truncate", "asn.csv", run_time::kDeviceError, 2);
+  const auto translator = trade.Loaded();
   EXPECT_EQ(trade.reports.size(), 1U);
-  EXPECT_EQ(trade.Files(), "asn.csv asn.csv.pending");
-  EXPECT_EQ(trade.Run().front().result, 1);
-  EXPECT_THAT(trade.Output(), ElementsAre("EARLIER", "SSCC1,1001,"));
-  EXPECT_EQ(trade.Files(), "asn.csv stock");
+  EXPECT_EQ(trade.Process(*translator).told, Texts{trade.Path("70 Open ASN File: Cannot open file FOLDERout/asn.csv")});
+  EXPECT_EQ(trade.Stamps(), "0/4");
+  EXPECT_EQ(trade.Pending(), 1);
+  EXPECT_EQ(trade.Process(*translator).result, 1);
+  EXPECT_EQ(trade.Output().size(), 2U);
+  EXPECT_EQ(trade.Pending(), 0);
 }
 
 // --- Other programs
@@ -215,9 +223,8 @@ TEST(NoticeFilesTest, TurnARowAwayWhileAnotherProgramHoldsThem) {
   };
   const Case cases[] = {
       {"out/asn.csv", "70 Open ASN File: Cannot open file FOLDERout/asn.csv"},
-      {"out/asn.csv.pending", "70 Open ASN File: Cannot open file FOLDERout/asn.csv"},
       {"out/stock", "70 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
-      {"out/stock.pending", "70 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
+      {"out/stock.new", "70 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
   };
   for (const Case& each : cases) {
     SCOPED_TRACE(each.held);
@@ -237,12 +244,38 @@ TEST(NoticeFilesTest, TurnARowAwayWhileAnotherProgramHoldsThem) {
   }
 }
 
+// It may be at work on that very notice.
+TEST(NoticeFilesTest, AreNotTakenUpWhileAnotherProgramHoldsThem) {
+  for (const char* held : {"out/asn.csv", "out/asn.csv.new"}) {
+    SCOPED_TRACE(held);
+    KilledTrade trade(kMade, "-");
+    trade.folder.Write(held, "");
+    {
+      const OtherProgram other(trade.folder / held);
+      trade.Loaded();
+      EXPECT_TRUE(trade.folder.Has(held));
+      EXPECT_EQ(trade.Pending(), 1);
+    }
+    trade.Loaded();
+    EXPECT_EQ(trade.Files() + std::to_string(trade.Pending()), "0");
+    EXPECT_THAT(trade.NewLog(), IsEmpty());
+  }
+}
+
+TEST(NoticeFilesTest, GrowByNothingWhenSomebodyElseHasTheNewName) {
+  FiledTrade trade;
+  trade.folder.Write("out/stock.new", "theirs");
+  EXPECT_EQ(trade.Run().front().told,
+            Texts{trade.Path("58 Open Inventory File: Cannot open inventory file FOLDERout/stock")});
+  EXPECT_EQ(trade.folder.Read("out/stock.new"), "theirs");
+}
+
 TEST(NoticeFilesTest, AreCutBackWithTheRunThatIsGivenUp) {
   FiledTrade trade;
   std::filesystem::remove(trade.folder / "out/asn.csv");
   trade.Sql("UPDATE tbPackLine SET Quantity = 40000");
   EXPECT_EQ(trade.Run().front().result, 0);
-  EXPECT_EQ(trade.Files(), "");
+  EXPECT_EQ(trade.Files() + std::to_string(trade.Pending()), "0");
 }
 
 }  // namespace

@@ -21,6 +21,7 @@ class FaultyFiles : public Files {
 
   std::uint64_t Length(const std::string& path) override { return Check("Length", path), real_.Length(path); }
   bool Exists(const std::string& path) override { return real_.Exists(path); }
+  std::string FullName(const std::string& path) override { return real_.FullName(path); }
   std::unique_ptr<InputFile> OpenInput(const std::string& path, Share share) override {
     Check("OpenInput", path);
     return std::make_unique<Input>(*this, path, real_.OpenInput(path, share));

@@ -143,9 +143,11 @@ def store_violations(scenario, folder, outputs):
         stored = connection.execute("SELECT Id, ASNNo, ShipmentId, OrderId FROM tbASN ORDER BY Id").fetchall()
         packs = connection.execute("SELECT SSCC, ASNId, Status, ShipmentId, OrderId FROM tbPack ORDER BY Id").fetchall()
         shipped = connection.execute("SELECT MIN(Status) FROM tbShipment").fetchone()[0]
+        pending = connection.execute("SELECT FileName FROM tbPendingNotice").fetchall()
     finally:
         connection.close()
     found = [] if shipped == 8 else [f"a shipment has Status {shipped}"]
+    found += [f"a notice for {name} is still pending" for name, in pending]
     waiting = sum(status < 8 for _, _, status, *_ in packs)
     if waiting:
         found.append(f"{waiting} packs still wait")
@@ -235,7 +237,7 @@ def together(program, scenario, folder, outputs, kill_after=None):
         connection.close()
         if waiting == 0 and turn > 0:
             break
-    # Notes of killed runs are taken up by the next of the same output.
+    # What killed runs left is taken up by the next.
     for output in outputs:
         program.process(folder, name=output)
     return found + store_violations(scenario, folder, sorted(set(outputs))) + verdict.log_violations(folder, program)

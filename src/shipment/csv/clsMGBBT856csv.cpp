@@ -40,7 +40,6 @@ bool clsMGBBT856csv::FillPack(Notice& notice, const Pack& pack) {
   if (!CsvNotice::FillPack(notice, pack)) return false;
   const auto subPacks = Values().SubPacks();
   if (subPacks.size() > kMostSubPacks) {
-    LogPacks(notice);
     notice.log.Note(kRejection, "New ASN ", "Only 20 Sub Packs allowed per lead pack");
     return false;
   }

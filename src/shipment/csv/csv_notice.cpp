@@ -79,6 +79,13 @@ void CsvNotice::BindColumns() {
     columns_.push_back(field);
   }
   quantity_ = map_.Find("QUANTITYSHIPPED");
+  if (values_.lines != NoticeLines::kEach)
+    std::erase_if(perLine_, [&](const Filled& f) { return f.field == quantity_; });
+  const auto perLine = [&](const MapField* column) {
+    return column != nullptr &&
+           (column == quantity_ || std::ranges::find(perLine_, column, &Filled::field) != perLine_.end());
+  };
+  leading_ = static_cast<std::size_t>(std::ranges::find_if(columns_, perLine) - columns_.begin());
 }
 
 bool CsvNotice::Prepare(Notice& notice) {
@@ -140,12 +147,13 @@ bool CsvNotice::FillPack(Notice&, const Pack&) {
 bool CsvNotice::WritePack(Notice& notice, const Pack& pack) {
   records_.SetPack(pack);
   if (!FillPack(notice, pack)) return false;
+  leadingText_.clear();
   const std::vector<std::shared_ptr<PackLine>> lines = records_.Lines();
   if (lines.empty()) return true;
   std::string told = "......Pack " + std::string(Str(pack.SSCC)) + " added to ConNote " +
                      std::string(Str(records_.Shipment().ConNoteNo));
   if (values_.logsOrder) told += " for PONo " + records_.Order().PONo;
-  notice.packsTold.push_back(std::move(told));
+  notice.log.Note(kInformation, "Process Pack", told);
   if (values_.lines == NoticeLines::kEach) {
     WriteEach(notice, lines);
   } else {
@@ -200,11 +208,16 @@ void CsvNotice::WriteRun(Notice& notice, std::int32_t quantity) {
 
 // Nothing is quoted or escaped: a comma in a value splits its column.
 void CsvNotice::WriteLine(Notice& notice) {
+  const auto append = [&](std::string& text, std::size_t from, std::size_t to) {
+    for (std::size_t n = from; n < to; ++n) {
+      if (columns_[n] != nullptr) text += TrimBlanks(columns_[n]->FieldValue);
+      text += ',';
+    }
+  };
+  if (leadingText_.empty()) append(leadingText_, 0, leading_);
   std::string& text = notice.files.Text(notice.output);
-  for (const MapField* column : columns_) {
-    if (column != nullptr) text += TrimBlanks(column->FieldValue);
-    text += ',';
-  }
+  text += leadingText_;
+  append(text, leading_, columns_.size());
   text += kLineEnd;
   ++records_.linesWritten;
 }

@@ -91,6 +91,8 @@ class CsvNotice : public CompileFrame {
   std::vector<MapField*> columns_;  // in the map's order; null for a column that stays empty
   std::vector<Filled> perNotice_, perPack_, perLine_;
   MapField* quantity_ = nullptr;
+  std::size_t leading_ = 0;  // so many columns are the same for all lines of a pack,
+  std::string leadingText_;  // and read so
 };
 
 }  // namespace partnerkit::shipment
