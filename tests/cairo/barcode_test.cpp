@@ -17,31 +17,22 @@ TEST(CairoBarcodeTest, ScannersReadWhatWasDrawn) {
     std::string_view data;
     const char* read;  // FNC1 is silent at the front of a symbol, and a group separator behind it
   } cases[] = {
-      {"~20100393123450000000017", "00393123450000000017\n"},
       {"~201421036"
        "3000"
        "~20190"
        "0123",
        "4210363000\x1d"
        "900123\n"},
-      {"~2010109312345000012"
-       "~20137"
-       "48",
-       "0109312345000012\x1d"
-       "3748\n"},
       {"CARTON 7/40", "CARTON 7/40\n"},
   };
   render::Drawing drawing(platform::DefaultPorts());
   for (const int dotsPerInch : {300, 203}) {
     for (const auto& test : cases) {
-      std::string png;
-      const auto device = MakePngDevice(Into(png), dotsPerInch);
-      device->StartPage(413, 583);
-      drawing.EAN128Barcode({*device, device->TwipsPerPixelX(), device->TwipsPerPixelY()}, test.data,
-                            {.x = 8, .y = 20, .height = 32, .barWidth = 0.5});
-      device->EndPage();
-      device->EndDoc();
-      EXPECT_EQ(Scanned(png), test.read) << dotsPerInch;
+      const Draw draw = [&](DrawingDevice& device) {
+        drawing.EAN128Barcode({device, device.TwipsPerPixelX(), device.TwipsPerPixelY()}, test.data,
+                              {.x = 8, .y = 20, .height = 32, .barWidth = 0.5});
+      };
+      EXPECT_EQ(Scanned(DrawnPng(413, 583, draw, dotsPerInch)), test.read) << dotsPerInch;
     }
   }
 }

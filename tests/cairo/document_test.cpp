@@ -19,15 +19,6 @@ void DrawPage(DrawingDevice& device, int width, int height, std::string_view tex
   device.EndPage();
 }
 
-struct Named {
-  const char* name;
-  std::unique_ptr<DrawingDevice> (*make)(ByteSink sink);
-};
-
-const Named kDevices[] = {{"PDF", [](ByteSink sink) { return MakePdfDevice(std::move(sink)); }},
-                          {"PNG", [](ByteSink sink) { return MakePngDevice(std::move(sink)); }},
-                          {"SVG", [](ByteSink sink) { return MakeSvgDevice(std::move(sink)); }}};
-
 TEST(CairoDocumentTest, APdfHasItsPagesTextsAndTitle) {
   const std::string pdf = DrawnPdf(
       [](DrawingDevice& device) {

@@ -25,15 +25,28 @@ inline ByteSink Into(std::string& text) {
   return [&text](std::string_view bytes) { text.append(bytes); };
 }
 
+// Each kind of document.
+struct Named {
+  const char* name;
+  std::unique_ptr<DrawingDevice> (*make)(ByteSink sink);
+};
+
+inline const Named kDevices[] = {{"PDF", [](ByteSink sink) { return MakePdfDevice(std::move(sink)); }},
+                                 {"PNG", [](ByteSink sink) { return MakePngDevice(std::move(sink)); }},
+                                 {"SVG", [](ByteSink sink) { return MakeSvgDevice(std::move(sink)); }}};
+
 // A picture at 100 dots an inch, so that sizes in hundredths are pixels.
-inline Picture Drawn(int width, int height, const Draw& draw, int dotsPerInch = 100) {
+inline std::string DrawnPng(int width, int height, const Draw& draw, int dotsPerInch = 100) {
   std::string png;
   const auto device = MakePngDevice(Into(png), dotsPerInch);
   device->StartPage(width, height);
   draw(*device);
   device->EndPage();
   device->EndDoc();
-  return testing::ReadPng(png);
+  return png;
+}
+inline Picture Drawn(int width, int height, const Draw& draw, int dotsPerInch = 100) {
+  return testing::ReadPng(DrawnPng(width, height, draw, dotsPerInch));
 }
 
 inline std::string DrawnPdf(const Draw& draw, const PdfOptions& options = {}) {

@@ -18,10 +18,17 @@
 
 namespace partnerkit::testing {
 
+using ::testing::ElementsAre;
+using ::testing::EndsWith;
+using ::testing::HasSubstr;
+using ::testing::IsEmpty;
+using ::testing::StartsWith;
+using Strings = std::vector<std::string>;
+
 // Printers "dock" (at 300 dots an inch) and "office" (at 200), which keep what was delivered.
 class KeepingSpooler : public Spooler {
  public:
-  std::vector<std::string> jobs;  // "dock PartnerKit.clsCMLSCM: bytes"; of a drawing, a line for each call
+  Strings jobs;  // "dock PartnerKit.clsCMLSCM: bytes"; of a drawing, a line for each call
   bool shut = false, broken = false, mute = false;  // can't be opened; can't deliver; can't be asked
   std::deque<std::int32_t> queues;                  // what JobCount finds, 0 once it is empty
   int opened = 0, asked = 0;
@@ -31,11 +38,11 @@ class KeepingSpooler : public Spooler {
   }
   std::unique_ptr<RawJob> OpenRaw(const std::string& printer, const std::string& document) override {
     CheckOpen(printer);
-    return std::make_unique<Raw>(*this, printer, document);
+    return std::make_unique<Raw>(*this, printer + " " + document);
   }
   std::unique_ptr<DrawingDevice> OpenDrawing(const std::string& printer, const std::string& document) override {
     CheckOpen(printer);
-    return std::make_unique<Drawn>(*this, printer, document);
+    return std::make_unique<Drawn>(*this, printer + " " + document);
   }
   std::int32_t JobCount(const std::string&) override {
     ++asked;
@@ -48,29 +55,27 @@ class KeepingSpooler : public Spooler {
 
  private:
   struct Raw : RawJob {
-    Raw(KeepingSpooler& of, const std::string& printer, const std::string& document)
-        : spooler(of), printer(printer), title(printer + " " + document + ": ") {}
+    Raw(KeepingSpooler& of, const std::string& job) : spooler(of), name(job) {}
     void Write(std::string_view bytes) override { text += bytes; }
-    void Close() override { spooler.Deliver(printer, title, text); }
+    void Close() override { spooler.Deliver(name, text); }
 
     KeepingSpooler& spooler;
-    std::string printer, title, text;
+    std::string name, text;
   };
 
   struct Drawn : RecordingDevice {
-    Drawn(KeepingSpooler& of, const std::string& printer, const std::string& document)
-        : spooler(of), printer(printer), title(printer + " " + document + ": ") {}
+    Drawn(KeepingSpooler& of, const std::string& job) : spooler(of), name(job) {}
     void StartPage(int width, int height) override {
       drawn.push_back("page " + std::to_string(width) + " x " + std::to_string(height));
     }
     void EndDoc() override {
       std::string text;
       for (const std::string& line : drawn) text += line + "\n";
-      spooler.Deliver(printer, title, text);
+      spooler.Deliver(name, text);
     }
 
     KeepingSpooler& spooler;
-    std::string printer, title;
+    std::string name;
   };
 
   void CheckOpen(const std::string& printer) {
@@ -79,23 +84,23 @@ class KeepingSpooler : public Spooler {
     if (shut) throw RunTimeError(run_time::kPrinter, "The lid is open");
   }
   // One without a byte is no job.
-  void Deliver(const std::string& printer, const std::string& title, const std::string& text) {
-    if (broken) throw RunTimeError(run_time::kDeviceError, "Out of paper on " + printer);
-    if (!text.empty()) jobs.push_back(title + text);
+  void Deliver(const std::string& job, const std::string& text) {
+    if (broken) throw RunTimeError(run_time::kDeviceError, "Out of paper");
+    if (!text.empty()) jobs.push_back(job + ": " + text);
   }
 };
 
 // What a batch of the trade's pack holds from its first field to the one ahead of the SSCC's.
 inline constexpr std::string_view kBatchFields =
     R"(1,"Acme Apparel"|2,"Brunswick"|3,"VIC"|4,"Linehaul"|5,"CN77"|6,"Altona"|7,"250 Dohertys Rd"|8,"Laverton 3026"|)"
-    R"(9,"2510"|10,"Ballarat"|11,"8 Sturt St"|12,"Ballarat"|13,"3350"|14,"0471"|15,"~2014210363026~201900471"|)"
+    R"(9,"2510"|10,"Ballarat"|11,"8 Sturt St"|12,"Ballarat East"|13,"3350"|14,"0471"|15,"~2014210363026~201900471"|)"
     R"(16,"(421)0363026(90)0471"|17,"(00)093123450000009015"|18,"PO 4500012345"|19,"AD"|20,"1203"|21,"HOMEWARES"|)";
 
 struct LabelTrade : TradingHost {
   using Settings = std::vector<std::pair<std::string_view, std::string_view>>;
 
   KeepingSpooler spooler;
-  std::vector<std::string> sent;  // to the port: "COM1 bytes"
+  Strings sent;  // to the port: "COM1 bytes"
   bool portGone = false;
   int yields = 0;
   cli::LabelHost labelHost{*system,
@@ -122,7 +127,7 @@ struct LabelTrade : TradingHost {
   });
   PartnerLocn store = New<PartnerLocn>([this](auto& r) {
     r.VendorId = "ACME", r.PartnerLocnNo = "471", r.Name = "Ballarat Central", r.ShortName = "Ballarat";
-    r.Address1 = "8 Sturt St", r.Suburb = "Ballarat", r.Postcode = "3350", r.CountryCode = "036";
+    r.Address1 = "8 Sturt St", r.Suburb = "Ballarat East", r.Postcode = "3350", r.CountryCode = "036";
     r.CarrierId = couriers.Id;
   });
   Order order = New<Order>([](auto& r) {
@@ -168,7 +173,7 @@ struct LabelTrade : TradingHost {
     sent.clear();
     return label;
   }
-  std::vector<std::string> Jobs() { return std::exchange(spooler.jobs, {}); }
+  Strings Jobs() { return std::exchange(spooler.jobs, {}); }
 };
 
 }  // namespace partnerkit::testing

@@ -56,8 +56,7 @@ TEST_F(DrawingTest, RoundsABarToTheNearestPixelAndAHalfToTheEven) {
   const struct {
     double twips, barWidth;
     std::string_view pen;
-  } cases[] = {{4.8, .3, "pen 4"}, {5.6, .25, "pen 2"}, {4.8, .21, "pen 2"}, {4.8, .23, "pen 3"},
-               {7.2, .4, "pen 3"}, {0, .5, "pen 28"},   {-1, .5, "pen 28"},  {15, .1, "pen 0"}};
+  } cases[] = {{4.8, .3, "pen 4"}, {5.6, .25, "pen 2"}, {0, .5, "pen 28"}, {-1, .5, "pen 28"}, {15, .1, "pen 0"}};
   for (const auto& test : cases) {
     drawing_.EAN128Barcode({device_, test.twips, 7.2}, "12", {.x = 1, .y = 2, .height = 3, .barWidth = test.barWidth});
     EXPECT_THAT(Drawn().at(0), ::testing::EndsWith(test.pen)) << test.twips << ' ' << test.barWidth;

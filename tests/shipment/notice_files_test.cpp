@@ -1,7 +1,4 @@
 // The files of a notice: whole or as they were, whatever fails, and taken up again after a killed run.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
 #include "support/faulty_files.h"
 #include "support/other_program.h"
 #include "support/packed_trade.h"
@@ -10,19 +7,15 @@ namespace partnerkit::testing {
 namespace {
 
 using ::testing::Contains;
-using ::testing::ElementsAre;
-using ::testing::IsEmpty;
-using Texts = std::vector<std::string>;
 
 constexpr const char* kTakenOut =
     "W Load: Notice 1001 of an interrupted run was never stored and is taken out of FOLDERout/asn.csv";
 
 // One pack, an inventory file and an output that was there before.
 struct FiledTrade : PackedTrade {
-  FiledTrade() : PackedTrade(kMgb), faulty(*ports.files) {
+  FiledTrade() : PackedTrade(kMgb, "CONTAINERNO SHIPNOTENO"), faulty(*ports.files) {
     ports.files = &faulty;
-    Map("CONTAINERNO SHIPNOTENO");
-    Sql("UPDATE tbPartner SET ASNExtension = 'TL2Compatible', InventoryFile = '" + folder / "out/stock" + "'");
+    UseInventory("out/stock");
     folder.Write("out/asn.csv", "EARLIER\r\n");
     AddPack();
   }

@@ -17,8 +17,8 @@ namespace fs = std::filesystem;
 
 class FolderTest : public ::testing::Test {
  protected:
-  std::string Deliver(std::string_view bytes, Content content = Content::kRaw) {
-    return fs::path(MakeFolder(folder / "", kShort)->Deliver(bytes, content, "PartnerKit.clsCMLSCM")).filename();
+  std::string Deliver(std::string_view bytes) {
+    return fs::path(MakeFolder(folder / "", kShort)->Deliver(bytes, Content::kRaw, "job")).filename();
   }
   std::set<std::string> Names() {
     std::set<std::string> names;
@@ -42,35 +42,29 @@ class FolderTest : public ::testing::Test {
   TempFolder folder;
 };
 
-TEST_F(FolderTest, NumbersGoOnFromTheHighestOfEitherKind) {
-  EXPECT_EQ(Deliver("first"), "0001.prn");
+TEST_F(FolderTest, NumbersGoOnFromTheHighestOfEitherKindAndBehindTheFilesOfOthers) {
+  const auto destination = MakeFolder(folder / "", kShort);
+  const auto deliver = [&](std::string_view bytes, Content content = Content::kRaw) {
+    return fs::path(destination->Deliver(bytes, content, "PartnerKit.clsCMLSCM")).filename();
+  };
+  EXPECT_EQ(deliver("first"), "0001.prn");
+  EXPECT_EQ(deliver("second"), "0002.prn");
   for (const char* name :
-       {"0007.prn", "12.pdf", "0100.txt", "99999999999999999.prn", "x13.prn", "14.prn.old", ".prn"}) {
+       {"0003.prn", "12.pdf", "0100.txt", "99999999999999999.prn", "x13.prn", "14.prn.old", ".prn"}) {
     folder.Write(name, "not ours");
   }
-  EXPECT_EQ(Deliver("%PDF-", Content::kPdf), "0013.pdf");
-  EXPECT_EQ(Deliver("third"), "0014.prn");
+  EXPECT_EQ(deliver("%PDF-", Content::kPdf), "0013.pdf");
+  EXPECT_EQ(Deliver("another program's"), "0014.prn");
+  EXPECT_EQ(deliver("third"), "0015.prn");
+  fs::remove(folder / "0015.prn");
+  EXPECT_EQ(deliver("third"), "0015.prn");
   folder.Write("9999.prn", "not ours");
-  EXPECT_EQ(Deliver(std::string("^XA\0^XZ", 7)), "10000.prn");
+  EXPECT_EQ(deliver(std::string("^XA\0^XZ", 7)), "10000.prn");
   EXPECT_EQ(folder.Read("0001.prn"), "first");
+  EXPECT_EQ(folder.Read("0003.prn"), "not ours");
   EXPECT_EQ(folder.Read("0013.pdf"), "%PDF-");
   EXPECT_EQ(folder.Read("10000.prn"), std::string("^XA\0^XZ", 7));
-  EXPECT_EQ(Names().size(), 12U);
-}
-
-TEST_F(FolderTest, NumbersGoOnBehindTheFilesOfAnotherProgram) {
-  const auto destination = MakeFolder(folder / "", kShort);
-  const auto deliver = [&] { return fs::path(destination->Deliver("job", Content::kRaw, "job")).filename(); };
-  EXPECT_EQ(deliver(), "0001.prn");
-  EXPECT_EQ(deliver(), "0002.prn");
-  folder.Write("0003.prn", "another's");
-  EXPECT_EQ(deliver(), "0004.prn");
-  folder.Write("0040.pdf", "another's");
-  EXPECT_EQ(deliver(), "0041.prn");
-  fs::remove(folder / "0041.prn");
-  EXPECT_EQ(deliver(), "0041.prn");
-  EXPECT_EQ(folder.Read("0003.prn"), "another's");
-  EXPECT_EQ(Names().size(), 6U);
+  EXPECT_EQ(Names().size(), 14U);
 }
 
 TEST_F(FolderTest, ProgramsThatSpoolAtOnceShareTheNumbers) {

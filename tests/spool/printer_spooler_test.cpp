@@ -2,33 +2,28 @@
 
 #include <filesystem>
 
-#include "partnerkit/drawing.h"
+#include "render/recording_device.h"
 #include "spool/spool_test.h"
 
 namespace partnerkit::spool {
 namespace {
 
-// A device that writes a document of its page sizes.
-class ListingDevice : public DrawingDevice {
+// A device that writes a document of what is drawn.
+class ListingDevice : public partnerkit::testing::RecordingDevice {
  public:
-  ListingDevice(ByteSink sink, const std::string& title) : sink_(std::move(sink)), text_(title) {}
+  ListingDevice(ByteSink sink, const std::string& title) : sink_(std::move(sink)) { drawn.push_back(title); }
   double TwipsPerPixelX() const override { return 4.8; }
   double TwipsPerPixelY() const override { return 7.2; }
   void StartPage(int width, int height) override {
-    text_ += " " + std::to_string(width) + "x" + std::to_string(height);
+    drawn.push_back(std::to_string(width) + "x" + std::to_string(height));
   }
-  void EndPage() override { sink_(std::exchange(text_, "")); }
-  void EndDoc() override { sink_(" end"); }
-  void Rectangle(const PixelRect& rect, int penWidth) override {
-    text_ += " [" + std::to_string(rect.left) + "," + std::to_string(penWidth) + "]";
+  void EndPage() override {
+    for (const std::string& each : std::exchange(drawn, {})) sink_(each + "; ");
   }
-  void Text(int x, int y, std::string_view text, const Font& font, const TextInks&) override {
-    text_ += " " + std::to_string(x) + "," + std::to_string(y) + std::string(text) + std::string(font.name);
-  }
+  void EndDoc() override { sink_("end"); }
 
  private:
   ByteSink sink_;
-  std::string text_;
 };
 
 class SpoolerTest : public ::testing::Test {
@@ -90,7 +85,8 @@ TEST_F(SpoolerTest, DeliversADrawingWhenItsDocumentEnds) {
   device->EndPage();
   EXPECT_FALSE(folder.Has("dock/0001.pdf"));
   device->EndDoc();
-  EXPECT_EQ(folder.Read("dock/0001.pdf"), "PartnerKit.clsMYERSCM 400x600 [5,9] 10,11CartonArial end");
+  EXPECT_EQ(folder.Read("dock/0001.pdf"),
+            "PartnerKit.clsMYERSCM; 400x600; 5 6 7 8 pen 9; 10 11 0 0 400 0 Arial black on white: Carton; end");
   EXPECT_THAT(spooler.Jobs(), ElementsAre("dock/0001.pdf"));
 }
 
@@ -105,7 +101,7 @@ TEST_F(SpoolerTest, AFailedJobMayBeClosedAgain) {
   job->Close();
   drawing->EndDoc();
   EXPECT_THAT(spooler.Jobs(), ElementsAre("later/0001.prn", "later/0002.pdf"));
-  EXPECT_EQ(folder.Read("later/0002.pdf"), " end");
+  EXPECT_EQ(folder.Read("later/0002.pdf"), "end");
   EXPECT_EQ(ErrorOf([&] { job->Write("more"); }), "52 Bad file name or number: job: The print job is closed");
   EXPECT_EQ(ErrorOf([&] { job->Close(); }), "52 Bad file name or number: job: The print job is closed");
 }

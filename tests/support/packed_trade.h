@@ -12,6 +12,11 @@
 
 namespace partnerkit::testing {
 
+using ::testing::ElementsAre;
+using ::testing::HasSubstr;
+using ::testing::IsEmpty;
+using Texts = std::vector<std::string>;
+
 inline constexpr const char* kMgb = "clsMGB856csv";
 inline constexpr const char* kMyerDrop = "clsMYERDropShipDAcsv";
 inline constexpr const char* kTargetNotice = "clsTarget856csv";
@@ -27,14 +32,14 @@ inline constexpr const char* kNoticeClasses[] = {kMgb,         kMyerDrop,       
 inline DateTime At(std::string_view iso) { return *DateTime::FromIso(iso); }
 
 // The words of a text, by blanks.
-inline std::vector<std::string> Words(const std::string& text) {
+inline Texts Words(const std::string& text) {
   std::istringstream words(text);
   return {std::istream_iterator<std::string>(words), std::istream_iterator<std::string>()};
 }
 
 // A file's lines; each has to end with CR LF.
-inline std::vector<std::string> LinesOf(std::string_view text) {
-  std::vector<std::string> lines;
+inline Texts LinesOf(std::string_view text) {
+  Texts lines;
   while (!text.empty()) {
     const std::size_t end = text.find("\r\n");
     if (end == std::string_view::npos) {
@@ -48,8 +53,8 @@ inline std::vector<std::string> LinesOf(std::string_view text) {
 }
 
 // The rows of the compile screen, the cells of each with "|" between; one that is all empty is "-".
-inline std::vector<std::string> NoticeRows(const RowTable& table) {
-  std::vector<std::string> rows;
+inline Texts NoticeRows(const RowTable& table) {
+  Texts rows;
   for (std::size_t row = 0; row < table.Rows(); ++row) {
     std::string cells;
     for (std::size_t column = 0; column < table.Columns(); ++column) {
@@ -65,11 +70,12 @@ inline std::vector<std::string> NoticeRows(const RowTable& table) {
 // one line and location with a slip; shipment 1 goes by carrier 1. Packs are added by the tests.
 class PackedTrade : public TradingHost {
  public:
-  explicit PackedTrade(std::string_view noticeClass) : className(noticeClass) {
+  // With these columns in its map; without any there is no map.
+  explicit PackedTrade(std::string_view noticeClass, const std::string& columns = {}) : className(noticeClass) {
     std::filesystem::create_directory(folder / "out");
     AddMasters();
-    AddShipment([](Shipment&) {});
-    AddOrder([](Order&) {});
+    AddShipment();
+    AddOrder();
     AddSlip();
     document.EDIDocId = 1;
     document.PartnerId = "MGB";
@@ -79,12 +85,16 @@ class PackedTrade : public TradingHost {
     document.MapFolder = folder / "";
     document.MapFile = "asn.map";
     Stored(document);
+    if (!columns.empty()) Map(columns);
   }
 
   // Statements with ";" between.
   void Sql(const std::string& statements) {
     std::istringstream each(statements);
     for (std::string statement; std::getline(each, statement, ';');) system->Session().Execute(statement);
+  }
+  void UseInventory(const std::string& name) {
+    Sql("UPDATE tbPartner SET ASNExtension = 'TL2Compatible', InventoryFile = '" + folder / name + "'");
   }
   void Map(const std::string& columns) const {
     std::string text;
@@ -129,7 +139,7 @@ class PackedTrade : public TradingHost {
     if (set) set(line);
     Stored(line);
   }
-  std::int32_t AddShipment(const std::function<void(Shipment&)>& set) {
+  std::int32_t AddShipment(const std::function<void(Shipment&)>& set = {}) {
     Shipment shipment;
     shipment.Status = 3;
     shipment.ConNoteNo = "CN5";
@@ -142,10 +152,10 @@ class PackedTrade : public TradingHost {
     shipment.DeliveryDate = At("2006-03-20");
     shipment.Weight = 123.456;
     shipment.Volume = 1.2345;
-    set(shipment);
+    if (set) set(shipment);
     return Stored(shipment).Id;
   }
-  std::int32_t AddOrder(const std::function<void(Order&)>& set) {
+  std::int32_t AddOrder(const std::function<void(Order&)>& set = {}) {
     Order order;
     order.VendorId = "ACME";
     order.PartnerId = "MGB";
@@ -156,13 +166,11 @@ class PackedTrade : public TradingHost {
     order.Header2 = "V2";
     order.PartnerSupplierNo = "PS9";
     order.CompanyCode = "CC8";
-    set(order);
+    if (set) set(order);
     return Stored(order).OrderId;
   }
-  // Nothing of the order is left to pack; nothing of its slips is.
+  // Nothing of the order is left to pack.
   void CompleteOrder() { Sql("UPDATE tbOrderLocnLine SET PackedQty = Quantity"); }
-  void CompleteSlip() { Sql("UPDATE tbPSlipLine SET PackedQty = OrderQty"); }
-  void CompleteShipment() { Sql("UPDATE tbShipment SET Complete = 1"); }
 
   // A class bound to the document and loaded with the output of that name.
   std::unique_ptr<Translator> Loaded(std::string_view output = "out/asn.csv") {
@@ -174,11 +182,11 @@ class PackedTrade : public TradingHost {
     rows = translator->Load(folder / output, table);
     return translator;
   }
-  std::vector<std::string> NewLog() { return LogLines(started_); }
+  Texts NewLog() { return LogLines(started_); }
 
   struct Outcome {
     std::int32_t result = 0;
-    std::vector<std::string> told;  // what the error list names
+    Texts told;  // what the error list names
   };
   Outcome Process(Translator& translator, std::int32_t row = 0) {
     ErrorList ids;
@@ -199,14 +207,14 @@ class PackedTrade : public TradingHost {
     return outcomes;
   }
   // The lines of the output, all its rows processed.
-  std::vector<std::string> Compiled() {
+  Texts Compiled() {
     Run();
     return Output();
   }
-  std::vector<std::string> Output(std::string_view name = "out/asn.csv") const { return LinesOf(folder.Read(name)); }
+  Texts Output(std::string_view name = "out/asn.csv") const { return LinesOf(folder.Read(name)); }
   // The names in the output folder, sorted; none without the folder.
   std::string Files() const {
-    std::vector<std::string> names;
+    Texts names;
     std::error_code noFolder;
     for (const auto& entry : std::filesystem::directory_iterator(folder / "out", noFolder)) {
       names.push_back(entry.path().filename());
@@ -215,11 +223,6 @@ class PackedTrade : public TradingHost {
     std::string all;
     for (const std::string& name : names) all += (all.empty() ? "" : " ") + name;
     return all;
-  }
-  // As before the first notice, for another one.
-  void Unstamp() {
-    Sql("DELETE FROM tbASN; UPDATE tbPack SET ASNId = 0, Status = 4; UPDATE tbPartner SET LastASNNo = 1000");
-    std::filesystem::remove(folder / "out/asn.csv");
   }
   // "notice/status" of each pack, by id.
   std::string Stamps() {
@@ -238,68 +241,22 @@ class PackedTrade : public TradingHost {
 
  private:
   void AddMasters() {
-    Stored(With<Partner>([](Partner& partner) {
-      partner.PartnerId = "MGB";
-      partner.Name = "MGB Stores";
-      partner.ABN = "11 222";
-      partner.LastASNNo = 1000;
-    }));
-    Stored(With<Vendor>([](Vendor& vendor) { vendor.VendorId = "ACME"; }));
-    Stored(With<PartnerAddress>([](PartnerAddress& carrier) {
-      carrier.Name = "Toll";
-      carrier.ProcessProgID = "Toll.Papers";
-    }));
-    Stored(With<PartnerLocn>([](PartnerLocn& location) {
-      location.VendorId = "ACME";
-      location.PartnerLocnNo = "0900";
-      location.Name = "MGB Altona";
-    }));
-    Stored(With<PackType>([](PackType& type) {
-      type.PackTypeId = "CARTON";
-      type.ShipPackCode = "CTN30";
-      type.PackageTypeCode = "P02";
-      type.Length = 40.5;
-      type.Width = 30;
-      type.Height = 20;
-    }));
-    AddProduct("93001", "TRAIN");
-    AddProduct("93002", "BEAR");
-  }
-  void AddProduct(const std::string& number, const std::string& inHouse) {
-    Stored(With<Product>([&](Product& product) {
-      product.ProductNo = number;
-      product.PartnerId = "MGB";
-      product.InHouseProdNo = inHouse;
-      product.ProductSize = "XL";
-    }));
+    Sql("INSERT INTO tbPartner(PartnerId, Name, ABN, LastASNNo) VALUES('MGB', 'MGB Stores', '11 222', 1000);"
+        "INSERT INTO tbVendor(VendorId) VALUES('ACME');"
+        "INSERT INTO tbPartnerAddress(Name, ProcessProgID) VALUES('Toll', 'Toll.Papers');"
+        "INSERT INTO tbPartnerLocn(VendorId, PartnerLocnNo, Name) VALUES('ACME', '0900', 'MGB Altona');"
+        "INSERT INTO tbPackType(PackTypeId, ShipPackCode, PackageTypeCode, Length, Width, Height)"
+        " VALUES('CARTON', 'CTN30', 'P02', 40.5, 30, 20);"
+        "INSERT INTO tbProduct(ProductNo, PartnerId, InHouseProdNo, ProductSize)"
+        " VALUES('93001', 'MGB', 'TRAIN', 'XL'), ('93002', 'MGB', 'BEAR', 'XL')");
   }
   void AddSlip() {
-    Stored(With<OrderLine>([](OrderLine& line) {
-      line.OrderId = 1;
-      line.LineNo = "7";
-      line.ProductNo = "93001";
-      line.Cost = 12.5;
-    }));
-    Stored(With<OrderLocn>([](OrderLocn& location) {
-      location.OrderId = 1;
-      location.CustomerRef = "REF8";
-    }));
-    Stored(With<OrderLocnLine>([](OrderLocnLine& line) {
-      line.OrderId = line.LineId = line.LocnId = 1;
-      line.LineRef = "LL31";
-      line.Quantity = 24;
-    }));
-    Stored(With<Job>([](Job& job) {
-      job.OrderId = 1;
-      job.PackerId = "PK4";
-    }));
-    Stored(With<PSlip>([](PSlip& slip) { slip.JobId = slip.OrderLocnId = 1; }));
-    Stored(With<PSlipLine>([](PSlipLine& line) {
-      line.PSlipId = line.OrderLocnLineId = 1;
-      line.APN = "93001";
-      line.LineRef = "SL32";
-      line.OrderQty = 18;
-    }));
+    Sql("INSERT INTO tbOrderLine(OrderId, LineNo, ProductNo, Cost) VALUES(1, '7', '93001', 12.5);"
+        "INSERT INTO tbOrderLocn(OrderId, CustomerRef) VALUES(1, 'REF8');"
+        "INSERT INTO tbOrderLocnLine(OrderId, LineId, LocnId, LineRef, Quantity) VALUES(1, 1, 1, 'LL31', 24);"
+        "INSERT INTO tbJob(OrderId, PackerId) VALUES(1, 'PK4');"
+        "INSERT INTO tbPSlip(JobId, OrderLocnId) VALUES(1, 1);"
+        "INSERT INTO tbPSlipLine(PSlipId, OrderLocnLineId, APN, LineRef, OrderQty) VALUES(1, 1, '93001', 'SL32', 18)");
   }
 
   std::int32_t started_ = 0;
