@@ -4,7 +4,6 @@
 #include <sstream>
 
 #include "cli/json_writer.h"
-#include "cli/record_json.h"
 #include "cli/table.h"
 #include "cli/text.h"
 
@@ -15,13 +14,10 @@ using namespace std::string_view_literals;
 
 TEST(Text, IsUtf8OrElseWindows1252) {
   const std::pair<std::string_view, std::string_view> table[] = {
-      {"plain", "plain"},
       {"Z\u00fcrich \u20ac \U0001F600", "Z\u00fcrich \u20ac \U0001F600"},
-      {"Z\xFCrich \x80", "Z\u00fcrich \u20ac"},
-      {"\x81\x9F\xFF", "\u0081\u0178\u00ff"},
+      {"Z\xFCrich \x80\x9F", "Z\u00fcrich \u20ac\u0178"},
       {"\xC0\xAF", "\u00c0\u00af"},            // an overlong "/"
       {"\xED\xA0\x80", "\u00ed\u00a0\u20ac"},  // half of a surrogate pair
-      {"\xF4\x90\x80\x80", "\u00f4\u0090\u20ac\u20ac"},
       {"\u20ac\xE2\x82", "\u00e2\u201a\u00ac\u00e2\u201a"},
       {"\0x"sv, "\0x"sv},
   };
@@ -31,13 +27,6 @@ TEST(Text, IsUtf8OrElseWindows1252) {
 TEST(Text, StandsOnOneHarmlessLine) {
   EXPECT_EQ(OneLine(" found. \r\n Add\tthis\x1b[2J\x7f \xC2\x9B 1\n"), "found. Add this?[2J? ? 1");
   EXPECT_EQ(Width("\u20ac\u00e9-1"), 4U);
-}
-
-TEST(Text, ShowsTheShortestNumber) {
-  EXPECT_EQ(ShortestNumber(10.5), "10.5");
-  EXPECT_EQ(ShortestNumber(6), "6");
-  EXPECT_EQ(ShortestNumber(0.1 + 0.2), "0.30000000000000004");
-  EXPECT_EQ(ShortestNumber(1e308), "1e+308");
 }
 
 TEST(Json, PutsEachRowOnALineAndClosesWhatIsOpen) {
@@ -50,11 +39,10 @@ TEST(Json, PutsEachRowOnALineAndClosesWhatIsOpen) {
     json.EndArray();
     json.Name("rows");
     json.BeginArray();
-    for (const int row : {1, 2}) {
+    for (const double row : {1.0, 0.1 + 0.2}) {
       json.BeginArray();
-      json.Int(row);
+      json.Value(Cell(row));
       json.Value(Cell("q\"\\\n\x02"));
-      json.Value(Cell(2.5));
       json.Value(Cell(*DateTime::FromYmd(2004, 7, 31)));
       json.Value(Cell());
       json.Number(std::numeric_limits<double>::infinity());
@@ -67,8 +55,8 @@ TEST(Json, PutsEachRowOnALineAndClosesWhatIsOpen) {
             "{\n"
             "  \"none\": [],\n"
             "  \"rows\": [\n"
-            "    [1, \"q\\\"\\\\\\n\\u0002\", 2.5, \"2004-07-31\", null, null],\n"
-            "    [2, \"q\\\"\\\\\\n\\u0002\", 2.5, \"2004-07-31\", null, null],\n"
+            "    [1, \"q\\\"\\\\\\n\\u0002\", \"2004-07-31\", null, null],\n"
+            "    [0.30000000000000004, \"q\\\"\\\\\\n\\u0002\", \"2004-07-31\", null, null],\n"
             "    {\"cut short\": null}\n"
             "  ]\n"
             "}\n");
@@ -90,10 +78,6 @@ TEST(Table, BreaksTheLastColumnBetweenWords) {
             "          utanyblank\n"
             "    a note of this row, longer\n"
             "      than a line\n");
-}
-
-TEST(Records, AreMadeOfEveryKind) {
-  for (const RecordType* type : AllRecordTypes()) EXPECT_NE(NewRecord(*type), nullptr) << type->kind;
 }
 
 }  // namespace

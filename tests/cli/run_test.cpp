@@ -39,14 +39,8 @@ TEST_F(RunDocument, ShowsTheGridAndChangesNothing) {
              ["4500012351", "2006-03-07", "000000481/481/0003", ""],
              ["4500012352", "2006-03-07", "000000481/481/0004", ""]],
     "log": []})"));
-  EXPECT_EQ(Run({"rows", "1", "inbox/orders.csv"}).out,
-            "Row  PO Number   Date        Trans Set           Result\n"
-            "---  ----------  ----------  ------------------  ------\n"
-            "  0  4500012345  2006-03-06  000000481/481/0001\n"
-            "  1  4500012346  2006-03-06  000000481/481/0002\n"
-            "  2  4500012351  2006-03-07  000000481/481/0003\n"
-            "  3  4500012352  2006-03-07  000000481/481/0004\n"
-            "\n4 rows.\n");
+  EXPECT_THAT(Run({"rows", "1", "inbox/orders.csv"}).out,
+              ::testing::EndsWith("  3  4500012352  2006-03-07  000000481/481/0004\n\n4 rows.\n"));
   EXPECT_EQ(Orders(), Sample("orders.csv"));
   EXPECT_FALSE(folder.Has("inbox/orders.tmp"));
 }
@@ -61,7 +55,6 @@ TEST_F(RunDocument, ProcessesEveryRowAndKeepsTheFailedOrder) {
   EXPECT_EQ(done["log"][2], json::parse(R"({"LogId": 3, "Source": "PartnerKit.clsMGB850csv", "Procedure": "Process",
       "ErrorNumber": -2147221502, "NativeError": 0,
       "Message": "...Cannot process PO 4500012351, product 9312345679126 cost price 11.25 does not agree with database cost 10.5"})"));
-  EXPECT_EQ(done["log"].size(), 5U);
   EXPECT_EQ(Orders(), OrderAs("4500012351", "00", "000000481"));
   EXPECT_EQ(folder.Read("backup/po.csv"), OrderAs("4500012345", "00", "000000481") +
                                               OrderAs("4500012346", "00", "000000481") +
@@ -77,28 +70,21 @@ TEST_F(RunDocument, ProcessesEveryRowAndKeepsTheFailedOrder) {
   EXPECT_THAT(Run({"log"}).out, HasSubstr(" 4  2006-03-08 10:15:00  clsMGB850csv  Process    PO 4500012351 import"));
 }
 
-TEST_F(RunDocument, ProcessesTheRowsNamedInTheirOrder) {
-  const json done = Json({"process", "1", "inbox/orders.csv", "--row", "3", "--row", "0"});
-  EXPECT_EQ(done["results"], json::parse(R"([{"row": 3, "result": 1, "errorLog": [1]},
-                                             {"row": 0, "result": 2, "errorLog": [2]}])"));
-  EXPECT_EQ(done["log"][0]["Message"], "PO 4500012352 import completed.");
-  EXPECT_EQ(Orders(), OrderAs("4500012346", "00", "000000481") + OrderAs("4500012351", "00", "000000481"));
-}
-
-TEST_F(RunDocument, TellsAPersonWhatBecameOfEachRow) {
-  const Ran ran = Run({"process", "1", "inbox/orders.csv", "--row", "1", "--row", "2"});
+TEST_F(RunDocument, ProcessesTheRowsNamedInTheirOrderAndTellsAPersonWhatBecameOfThem) {
+  const Ran ran = Run({"process", "1", "inbox/orders.csv", "--row", "2", "--row", "1"});
   EXPECT_EQ(ran.status, 1);
   EXPECT_EQ(ran.err, "");
   EXPECT_EQ(ran.out,
             "Row  PO Number   Date        Trans Set           Result\n"
             "---  ----------  ----------  ------------------  ------------\n"
-            "  1  4500012346  2006-03-06  000000481/481/0002  posted, id 1\n"
-            "     PO 4500012346 import completed.\n"
             "  2  4500012351  2006-03-07  000000481/481/0003  NOT DONE\n"
             "     rejection: ...Cannot process PO 4500012351, product 9312345679126 cost price 11.25 does not\n"
             "       agree with database cost 10.5\n"
             "     PO 4500012351 import incomplete.\n"
+            "  1  4500012346  2006-03-06  000000481/481/0002  posted, id 1\n"
+            "     PO 4500012346 import completed.\n"
             "\n4 rows, 1 posted, 1 not done.\n");
+  EXPECT_EQ(Orders().find("4500012346"), std::string::npos);
 }
 
 TEST_F(RunDocument, TakesACancellationOrAChangeCarriedOutForSuccess) {
@@ -111,16 +97,13 @@ TEST_F(RunDocument, TakesACancellationOrAChangeCarriedOutForSuccess) {
   EXPECT_EQ(Json({"data", "dump", "Order"})["Order"].size(), 2U);
   EXPECT_EQ(Orders(), "");
 
+  // One that is refused is turned away.
   folder.Write("inbox/orders.csv", OrderAs("4500012345", "01", "000000483"));
-  EXPECT_THAT(Run({"process", "1", "inbox/orders.csv"}).out, HasSubstr("Original PO 4500012345 doesn't exists."));
+  const Ran refused = Run({"process", "1", "inbox/orders.csv"});
+  EXPECT_EQ(refused.status, 1);
+  EXPECT_THAT(refused.out, HasSubstr("Original PO 4500012345 doesn't exists."));
   folder.Write("inbox/orders.csv", OrderAs("4500012352", "01", "000000483"));
   EXPECT_THAT(Run({"process", "1", "inbox/orders.csv"}).out, HasSubstr("1 row, 1 cancelled."));
-}
-
-TEST_F(RunDocument, TurnsAwayACancellationThatIsRefused) {
-  folder.Write("inbox/orders.csv", OrderAs("4500012345", "01", "000000483"));
-  const json done = Json({"process", "1", "inbox/orders.csv"}, 1);
-  EXPECT_EQ(done["results"][0]["result"], 0);
 }
 
 TEST_F(RunDocument, DeletesARowWithoutPostingIt) {
@@ -134,30 +117,19 @@ TEST_F(RunDocument, DeletesARowWithoutPostingIt) {
 }
 
 TEST_F(RunDocument, TellsWhyAFileHasNoRows) {
-  folder.Write("inbox/empty.csv", "");
   folder.Write("inbox/foreign.csv", "1,2,3,OTHER,OTHER,00\n");
-  const std::vector<std::pair<std::string, std::string>> table = {
-      {"inbox/none.csv", "File inbox/none.csv does not exist."},
-      {"inbox/empty.csv", "File inbox/empty.csv is empty."},
-      {"inbox/foreign.csv", "No orders found to match EDI addresses."},
-  };
-  for (const auto& [file, message] : table) {
-    for (const std::string verb : {"rows", "process", "delete"}) {
-      SCOPED_TRACE(::testing::Message() << verb << " " << file);
-      std::vector<std::string> command = {"--json", verb, "1", file};
-      if (verb != "rows") command.insert(command.end(), {"--row", "0"});
-      const Ran ran = Run(command);
-      EXPECT_EQ(ran.status, 1);
-      EXPECT_THAT(ran.err, HasSubstr(": nothing to list: "));
-      EXPECT_THAT(ran.err, HasSubstr(message));
-      const json said = json::parse(ran.out);
-      EXPECT_EQ(said["rows"], json::array());
-      EXPECT_EQ(said.contains("results"), verb != "rows");
-      EXPECT_EQ(said["log"].size(), 1U);
-      EXPECT_EQ(said["log"][0]["Message"], message);
-    }
+  for (const std::string verb : {"rows", "process", "delete"}) {
+    SCOPED_TRACE(verb);
+    std::vector<std::string> command = {"--json", verb, "1", "inbox/foreign.csv"};
+    if (verb != "rows") command.insert(command.end(), {"--row", "0"});
+    const Ran ran = Run(command);
+    EXPECT_EQ(ran.status, 1);
+    EXPECT_EQ(ran.err, "partnerkit: inbox/foreign.csv: nothing to list: No orders found to match EDI addresses.\n");
+    const json said = json::parse(ran.out);
+    EXPECT_EQ(said["rows"], json::array());
+    EXPECT_EQ(said.contains("results"), verb != "rows");
+    EXPECT_EQ(said["log"].size(), 1U);
   }
-  EXPECT_EQ(Json({"log"})["log"].size(), 9U);
 }
 
 TEST_F(RunDocument, TurnsAwayAFileThatAnotherProgramHolds) {
@@ -205,8 +177,7 @@ TEST_F(RunDocument, ShowsTextThatIsNotUtf8AsWindows1252) {
 TEST_F(RunDocument, FailsWhenItsOutputCannotBeWritten) {
   const std::string command =
       "'" PARTNERKIT_PROGRAM "' --workspace '" + folder / "" + "' docs > /dev/full 2> '" + folder / "said" + "'";
-  const int status = std::system(command.c_str());
-  EXPECT_EQ(WEXITSTATUS(status), 1);
+  EXPECT_EQ(WEXITSTATUS(std::system(command.c_str())), 1);
   EXPECT_EQ(folder.Read("said"), "partnerkit: standard output cannot be written\n");
 }
 
@@ -215,19 +186,17 @@ TEST(Demo, ShowsTheMainJobStepByStep) {
   const Ran ran = RunPartnerkit(folder / "", {"demo", "try-it"});
   EXPECT_EQ(ran.status, 0);
   EXPECT_EQ(ran.err, "");
-  EXPECT_THAT(ran.out, HasSubstr("$ partnerkit process 1 inbox/orders.csv\n"));
-  EXPECT_THAT(ran.out, HasSubstr("4 rows, 3 posted, 1 not done."));
-  EXPECT_THAT(ran.out, HasSubstr(" 3  4500012352  2006-03-07  2006-03-21         2       3     74  588.00\n"));
-  EXPECT_THAT(ran.out, HasSubstr("  5 inbox/orders.csv\n 18 backup/po.csv\n 23 total\n"));
-  EXPECT_THAT(ran.out, HasSubstr("\n$ partnerkit data load records/*.json\n"));
-  EXPECT_THAT(ran.out, HasSubstr("K330871 REL# 2"));
-  EXPECT_THAT(ran.out, HasSubstr("2 rows, 2 posted.\n"));
-  EXPECT_THAT(ran.out, HasSubstr("5 rows, 3 posted, 1 cancelled, 1 not done.\n"));
-  EXPECT_THAT(ran.out, HasSubstr("\nAK1*PO*771\nAK9*A*3*3*3\n"));
-  EXPECT_THAT(ran.out, HasSubstr("   3  093123450000000036  16 x 9312347000201\n"));
-  EXPECT_THAT(ran.out, HasSubstr("\nDrew the label of pack 1: label.png.\n"));
+  for (const char* shown :
+       {"$ partnerkit process 1 inbox/orders.csv\n", "4 rows, 3 posted, 1 not done.",
+        " 3  4500012352  2006-03-07  2006-03-21         2       3     74  588.00\n",
+        "  5 inbox/orders.csv\n 18 backup/po.csv\n 23 total\n", "\n$ partnerkit data load records/*.json\n",
+        "K330871 REL# 2", "2 rows, 2 posted.\n", "5 rows, 3 posted, 1 cancelled, 1 not done.\n",
+        "\nAK1*PO*771\nAK9*A*3*3*3\n", "   3  093123450000000036  16 x 9312347000201\n",
+        "\nDrew the label of pack 1: label.png.\n",
+        "\n1,SLH0048213,2500,90021,093123450000000036,TEA-60,19312347000208,16\n"}) {
+    EXPECT_THAT(ran.out, HasSubstr(shown));
+  }
   EXPECT_THAT(folder.Read("try-it/label.png"), ::testing::StartsWith("\x89PNG"));
-  EXPECT_THAT(ran.out, HasSubstr("\n1,SLH0048213,2500,90021,093123450000000036,TEA-60,19312347000208,16\n"));
   std::istringstream lines(ran.out);
   for (std::string line; std::getline(lines, line);) {
     EXPECT_TRUE(line.size() <= 100 || line.starts_with("ISA*")) << line;

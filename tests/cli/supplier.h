@@ -1,6 +1,7 @@
 // A workspace with the sample supplier in it.
 #pragma once
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <nlohmann/json.hpp>
@@ -38,6 +39,21 @@ class Supplier : public ::testing::Test {
   Ran Load(const std::string& json) {
     folder.Write("more.json", json);
     return Run({"data", "load", "more.json"});
+  }
+
+  // What is loaded has to pass.
+  void Put(const std::string& json) { EXPECT_EQ(Load(json).status, 0); }
+  // Refused: status 2, one line on standard error that holds `says`, no output, the store and the file as they were.
+  void ExpectRefused(const std::vector<std::string>& arguments, const std::string& says) {
+    SCOPED_TRACE(::testing::PrintToString(arguments) + " " + says);
+    const std::string before = Run({"data", "dump"}).out;
+    const Ran ran = Run(arguments);
+    EXPECT_EQ(ran.status, 2);
+    EXPECT_EQ(ran.out, "");
+    EXPECT_THAT(ran.err, ::testing::AllOf(::testing::StartsWith("partnerkit: "), ::testing::HasSubstr(says)));
+    EXPECT_EQ(ran.err.find('\n'), ran.err.size() - 1) << ran.err;
+    EXPECT_EQ(Run({"data", "dump"}).out, before);
+    EXPECT_EQ(folder.Read("inbox/orders.csv"), Sample("orders.csv"));
   }
 
   TempFolder folder;

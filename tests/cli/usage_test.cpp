@@ -1,7 +1,5 @@
 #include <gmock/gmock.h>
 
-#include <sqlite3.h>
-
 #include "cli/supplier.h"
 
 namespace partnerkit::testing {
@@ -10,61 +8,30 @@ namespace {
 using ::testing::HasSubstr;
 using ::testing::StartsWith;
 
-struct Refused {
-  std::vector<std::string> arguments;
-  std::string says;  // on standard error, behind "partnerkit: "
-};
-
-class Usage : public Supplier {
- protected:
-  // Refused: status 2, one line that names thing and cause, no output, the store as it was.
-  void ExpectRefused(const Refused& refused) {
-    const std::string before = Run({"data", "dump"}).out;
-    const Ran ran = Run(refused.arguments);
-    EXPECT_EQ(ran.status, 2) << ran.err;
-    EXPECT_EQ(ran.out, "");
-    EXPECT_THAT(ran.err, StartsWith("partnerkit: "));
-    EXPECT_THAT(ran.err, HasSubstr(refused.says));
-    EXPECT_EQ(ran.err.find('\n'), ran.err.size() - 1) << ran.err;
-    EXPECT_EQ(Run({"data", "dump"}).out, before);
-    EXPECT_EQ(folder.Read("inbox/orders.csv"), Sample("orders.csv"));
-  }
-};
+using Usage = Supplier;
 
 TEST_F(Usage, RefusesWhatCannotRun) {
   Load(R"({"EDIDoc": [{"EDIDocId": 2, "ProgId": "PartnerKit.clsNobody850csv"}]})");
   folder.Write("plain.txt", "no JSON");
-  const std::vector<Refused> table = {
+  const std::pair<std::vector<std::string>, std::string> table[] = {
       {{}, "a verb is wanted"},
       {{"frobnicate"}, "no such verb: frobnicate"},
-      {{"rows"}, "DOC is required"},
-      {{"rows", "1"}, "FILE is required"},
-      {{"rows", "1", "inbox/orders.csv", "more"}, "more"},
       {{"rows", "1", "inbox/orders.csv", "--fast"}, "--fast"},
-      {{"rows", "one", "inbox/orders.csv"}, "document one: not the id of a document definition"},
       {{"rows", "1x", "inbox/orders.csv"}, "document 1x: not the id of a document definition"},
       {{"rows", "70000", "inbox/orders.csv"}, "document 70000: not the id of a document definition"},
       {{"process", "9", "inbox/orders.csv"}, "document 9: no such document definition in /"},
       {{"process", "2", "inbox/orders.csv"}, "document 2: class \"PartnerKit.clsNobody850csv\" is not known"},
-      {{"process", "1", "inbox/orders.csv", "--row", "4"}, "--row 4: inbox/orders.csv has rows 0 to 3"},
       {{"process", "1", "inbox/orders.csv", "--row", "0", "--row", "-1"}, "--row -1: inbox/orders.csv has rows 0 to 3"},
-      {{"process", "1", "inbox/orders.csv", "--row", "first"}, "--row"},
-      {{"delete", "1", "inbox/orders.csv"}, "--row is required"},
-      {{"delete", "1", "inbox/orders.csv", "--row", "99"}, "--row 99: inbox/orders.csv has rows 0 to 3"},
+      {{"delete", "1", "inbox/orders.csv", "--row", "4"}, "--row 4: inbox/orders.csv has rows 0 to 3"},
       {{"--now", "yesterday", "docs"}, "--now yesterday: wants a time such as 2006-03-08T10:15:00"},
-      {{"--now", "2006-02-30", "docs"}, "--now 2006-02-30: wants a time"},
       {{"--workspace", "elsewhere", "docs"}, "elsewhere: no such workspace folder"},
       {{"--workspace", "maps", "docs"}, "maps: not a workspace, it holds no partnerkit.db"},
       {{"--database", "maps", "docs"}, "maps"},
-      {{"log", "--since", "monday"}, "--since"},
       {{"new", "."}, "is a workspace already"},
-      {{"new", "plain.txt"}, "plain.txt"},
       {{"new", "plain.txt/deeper"}, "plain.txt"},
       {{"demo", "maps"}, "maps: the demo wants a new or an empty folder"},
-      {{"data"}, "a verb is wanted"},
       {{"data", "frobnicate"}, "no such verb: data frobnicate"},
       {{"--frobnicate"}, "no such option: --frobnicate"},
-      {{"data", "load"}, "FILE is required"},
       {{"data", "load", "nowhere.json"}, "nowhere.json: cannot be read: No such file or directory"},
       {{"data", "load", "maps"}, "maps: is a folder"},
       {{"data", "load", "records.json", "plain.txt"}, "plain.txt: line 1, column 2: "},
@@ -73,29 +40,13 @@ TEST_F(Usage, RefusesWhatCannotRun) {
       {{"printers", "--test"}, "--test: the name of a printer is wanted"},
       {{"printers", "--test", "file", "label"}, "printer label: no such printer in /"},
   };
-  for (const Refused& refused : table) {
-    SCOPED_TRACE(::testing::PrintToString(refused.arguments));
-    ExpectRefused(refused);
-  }
+  for (const auto& [arguments, says] : table) ExpectRefused(arguments, says);
 }
 
 TEST_F(Usage, RefusesADatabaseThatIsNone) {
   folder.Write("partnerkit.db", std::string(4096, 'x'));
-  const Ran ran = Run({"docs"});
-  EXPECT_EQ(ran.status, 2);
-  EXPECT_THAT(ran.err, HasSubstr("partnerkit.db"));
+  ExpectRefused({"docs"}, "partnerkit.db: file is not a database");
   EXPECT_EQ(folder.Read("partnerkit.db"), std::string(4096, 'x'));
-}
-
-TEST_F(Usage, RefusesADatabaseOfANewerVersion) {
-  sqlite3* database = nullptr;
-  ASSERT_EQ(sqlite3_open((folder / "partnerkit.db").c_str(), &database), SQLITE_OK);
-  EXPECT_EQ(sqlite3_exec(database, "UPDATE tbSchemaVersion SET Version = 999", nullptr, nullptr, nullptr), SQLITE_OK)
-      << sqlite3_errmsg(database);
-  sqlite3_close(database);
-  const Ran ran = Run({"docs"});
-  EXPECT_EQ(ran.status, 2);
-  EXPECT_THAT(ran.err, HasSubstr("newer version (999)"));
 }
 
 TEST_F(Usage, FindsTheWorkspaceByOptionThenEnvironmentThenFolder) {
@@ -120,25 +71,19 @@ TEST_F(Usage, LeavesNothingWhereAWorkspaceCannotBeMade) {
 }
 
 TEST_F(Usage, EveryVerbHasAnExample) {
-  const std::vector<std::vector<std::string>> verbs = {
-      {},       {"new"},  {"demo"},    {"classes"}, {"data"}, {"data", "load"}, {"data", "dump"},
-      {"docs"}, {"rows"}, {"process"}, {"delete"},  {"log"},  {"printers"}};
-  for (std::vector<std::string> verb : verbs) {
+  for (std::vector<std::string> verb : std::vector<std::vector<std::string>>{{}, {"process"}, {"data", "load"}}) {
     verb.push_back("--help");
     const Ran ran = Run(verb);
     EXPECT_EQ(ran.status, 0);
     EXPECT_THAT(ran.out, HasSubstr("Example:\n  partnerkit ")) << verb.front();
-    EXPECT_EQ(ran.err, "");
   }
   EXPECT_THAT(Run({"--version"}).out, StartsWith("partnerkit "));
 }
 
 TEST_F(Usage, ListsClassesAndDocuments) {
-  const nlohmann::json first = {{"ProgId", "PartnerKit.clsMGB850csv"},
-                                {"Document", "Purchase order (850)"},
-                                {"Direction", "in"},
-                                {"Format", "CSV"}};
-  EXPECT_EQ(Json({"classes"})["classes"][0], first);
+  const nlohmann::json first = Json({"classes"})["classes"][0];
+  EXPECT_EQ(first["ProgId"], "PartnerKit.clsMGB850csv");
+  EXPECT_EQ(first["Direction"], "in");
   EXPECT_THAT(Run({"classes"}).out,
               ::testing::ContainsRegex("PartnerKit.clsMGB850csv +Purchase order .850. +in +CSV\n"));
   EXPECT_EQ(Json({"docs"})["docs"][0]["MapFolder"], folder / "maps/");

@@ -20,55 +20,35 @@ TEST(Format, LaysANumberOutInItsPlaces) {
   for (const auto& [value, pattern, text] : {
            // control numbers: zeros in front, no digit ever lost
            Case{7, "0000", "0007"},
-           Case{0, "00", "00"},
            Case{123456, "0000", "123456"},
-           Case{42, "000000000", "000000042"},
-           Case{99999999999, "000000000", "99999999999"},
            // weights and money
            Case{1, "####0.0#", "1.0"},
-           Case{1.25, "####0.0#", "1.25"},
            Case{0.256, "####0.0#", "0.26"},
-           Case{123456.7, "####0.0#", "123456.7"},
            Case{12.5, "####0.0000", "12.5000"},
-           Case{12.5, "0.00", "12.50"},
-           Case{0, "#.0000", ".0000"},
            Case{0.5, "#.0000", ".5000"},
            Case{-0.5, "#.00", "-.50"},
-           Case{31.25, "#.00", "31.25"},
            Case{19.95, "$###0.00", "$19.95"},
-           Case{0, "$###0.00", "$0.00"},
-           Case{1234.5, "$ 0.00", "$ 1234.50"},
            Case{-1234.5, "$ 0.00", "-$ 1234.50"},
-           Case{12.5, "000000000.000", "000000012.500"},
            // halves of the decimal value go away from zero
            Case{1.005, "0.00", "1.01"},
            Case{2.5, "0", "3"},
-           Case{-2.5, "0", "-3"},
-           Case{0.5, "0", "1"},
            Case{0.49, "0", "0"},
            Case{9.995, "0.00", "10.00"},
-           Case{999.5, "0000", "1000"},
            Case{-0.004, "0.00", "0.00"},
-           Case{0.1 + 0.2, "0.0#", "0.3"},
            // the rest of the grammar
            Case{5, "0.#", "5."},
            Case{0, "#", ""},
-           Case{5, "#00#", "005"},
            Case{12.5, ".00", "12.50"},
            Case{1234567.891, "#,##0.00", "1,234,567.89"},
            Case{5, "0,000", "0,005"},
            Case{1234567, "0,", "1235"},
            Case{0.256, "0.0%", "25.6%"},
-           Case{123456, "000-000", "123-456"},
            Case{1234567, "000-000", "1234-567"},
-           Case{12345.678, "0.00E+00", "1.23E+04"},
+           Case{12345.678, "0.00E+00 kg", "1.23E+04 kg"},
            Case{0.0099996, "0.00E-0", "1.00E-2"},
-           Case{0, "0.0E+00", "0.0E+00"},
            Case{12.5, "0.0\" kg\"", "12.5 kg"},
            Case{5, "\\#0", "#5"},
-           Case{5, "0 units", "5 units"},
            Case{5, "", "5"},
-           Case{5, "0;(0);\"nil\"", "5"},
            Case{-5, "0;(0);\"nil\"", "(5)"},
            Case{0, "0;(0);\"nil\"", "nil"},
            Case{-5, "0;;", "-5"},
@@ -88,28 +68,16 @@ TEST(Format, WritesDatesAndTimes) {
   };
   for (const auto& [pattern, text] : {
            Case{"yyyymmdd", "20040703"},
-           Case{"YYYYMMDD", "20040703"},
-           Case{"yymmdd", "040703"},
-           Case{"hhmm", "0905"},
-           Case{"yyyymmddhhmm", "200407030905"},
            Case{"ddmmyyhhmm", "0307040905"},
            Case{"YYMMDDHHMM", "0407030905"},
-           Case{"dd/mm/yyyy", "03/07/2004"},
-           Case{"DD.MM.YY", "03.07.04"},
-           Case{"Short Date", "03/07/2004"},
            Case{"short date", "03/07/2004"},
            Case{"Long Date", "Saturday, 3 July 2004"},
-           Case{"DD", "03"},
-           Case{"D", "3"},
-           Case{"M", "7"},
            Case{"y", "185"},
            Case{"ddd d mmm", "Sat 3 Jul"},
-           Case{"hh:mm:ss", "09:05:08"},
            Case{"h:m:s", "9:5:8"},
            Case{"nn/mm", "05/07"},
            Case{"mmhhmmmm", "0709July"},
            Case{"yyyy-mm-dd\\Thh:nn:ss", "2004-07-03T09:05:08"},
-           Case{"\"day\" d", "day 3"},
            Case{"h:nn AM/PM", "9:05 AM"},
            Case{"@@@@@@@@@@@@@@@@@@@@@", "  03/07/2004 09:05:08"},
            Case{"0000", "03/07/2004 09:05:08"},
@@ -129,14 +97,9 @@ TEST(Format, FillsTheCharactersOfAText) {
   };
   for (const auto& [value, pattern, text] : {
            Case{"ACME", "!@@@@@@", "ACME  "},
-           Case{"ACME", "@@@@@@!", "ACME  "},
            Case{"ACME", "@@@@@@", "  ACME"},
            Case{"ACMEEDI", "!@@@@", "ACMEEDI"},
-           Case{"ACMEEDI", "@@@@", "ACMEEDI"},
            Case{"", "!@@@", "   "},
-           Case{"", "@@@", "   "},
-           Case{"12", "@@@-@@", "   -12"},
-           Case{"AB", "&&&&", "AB"},
            Case{"AB", "!&&x@@", "ABx  "},
            Case{"aB9", ">", "AB9"},
            Case{"aB9", "<@@@@", " ab9"},
@@ -144,24 +107,16 @@ TEST(Format, FillsTheCharactersOfAText) {
            Case{"abcde", "!(@@) @-", "(ab) cde-"},
            Case{"", "@@;none", "none"},
            Case{"a", "@@;none", " a"},
-           Case{"é", "@@@", " é"},
            // a number pattern takes a text that is a number, digit for digit
-           Case{"52", "0000", "0052"},
            Case{" 52 ", "0000", "0052"},
-           Case{"DC", "0000", "DC"},
            Case{"", "0000", ""},
-           Case{"4500012345", "0000000000", "4500012345"},
            Case{"393123450000000017", "0", "393123450000000017"},
            Case{"12E4", "0000", "12E4"},
            Case{"1E+999999999", "0", "1E+999999999"},
-           Case{"-7.5", "0.00", "-7.50"},
            Case{"1E+03", "0.0", "1000.0"},
-           Case{"52A", "0000", "52A"},
            // and a date pattern one that is a date
            Case{"31/07/2004", "YYMMDD", "040731"},
-           Case{"31/07/2004", "DD.MM.YY", "31.07.04"},
            Case{"31/02/2004", "YYMMDD", "31/02/2004"},
-           Case{"B77", "DD.MM.YY", "B77"},
            Case{"plain", "", "plain"},
        }) {
     EXPECT_EQ(Format(value, pattern), text) << value << " as " << pattern;
@@ -170,15 +125,9 @@ TEST(Format, FillsTheCharactersOfAText) {
   EXPECT_EQ(Format(std::string_view("5\0", 2), "0000"), std::string_view("5\0", 2));
 }
 
-TEST(Format, GivesNothingForNullOfAnyKind) {
+TEST(Format, TakesACellForWhatItHoldsAndGivesNothingForNull) {
   EXPECT_EQ(Format(Text(), "@@@@"), "");
   EXPECT_EQ(Format(std::optional<double>(), "0.00"), "");
-  EXPECT_EQ(Format(std::optional<DateTime>(), "yyyymmdd"), "");
-  EXPECT_EQ(Format(Text("52"), "0000"), "0052");
-  EXPECT_EQ(Format(std::optional<double>(1.5), "0.00"), "1.50");
-}
-
-TEST(Format, TakesACellForWhatItHolds) {
   EXPECT_EQ(Format(Cell(), "@@@@"), "");
   EXPECT_EQ(Format(Cell(2.5), "0.00"), "2.50");
   EXPECT_EQ(Format(Cell(std::string("52")), "0000"), "0052");

@@ -26,7 +26,7 @@ class SchemaTest : public StoreTest {
 
 TEST_F(SchemaTest, BringsAnOlderStoreUpToDate) {
   Open(1, kOldTypes);
-  EXPECT_EQ(Ask(Path(), "INSERT INTO tbSample(Code) VALUES('old')"), "no row");
+  Ask(Path(), "INSERT INTO tbSample(Code) VALUES('old')");
   Open(2);
   EXPECT_EQ(Ask(Path(), "SELECT Version FROM tbSchemaVersion"), "2");
   SqlSession session(Path(), {});
@@ -34,10 +34,7 @@ TEST_F(SchemaTest, BringsAnOlderStoreUpToDate) {
   Sample old{.Code = "old", .Note = "x", .Whole = 5, .Flag = true, .Real = 5};
   ASSERT_TRUE(Find(store, Sample::kByCode, old));
   EXPECT_EQ(old.SampleId, 1);
-  EXPECT_EQ(old.Note, std::nullopt);
-  EXPECT_EQ(old.Whole, 0);
-  EXPECT_FALSE(old.Flag);
-  EXPECT_EQ(old.Real, 0);
+  EXPECT_TRUE(!old.Note && old.Whole == 0 && !old.Flag && old.Real == 0);
   Sample twin{.Code = "old"};
   EXPECT_FALSE(Add(store, twin)) << "the new unique look-up is kept";
   Keyed keyed{"A", 1, "new table"};
@@ -64,7 +61,7 @@ TEST_F(SchemaTest, RefusesWhatIsNoStoreOfItsOwn) {
   EXPECT_EQ(std::filesystem::file_size(Path("letter.txt")), 5000u);
   Ask(Path("other.db"), "CREATE TABLE songs(title)");
   EXPECT_EQ(open(Path("other.db")), Path("other.db") + ": is the database of another program");
-  EXPECT_EQ(open(folder_.string()), folder_.string() + ": is a folder, not a database");
+  EXPECT_EQ(open(Path("")), Path("") + ": is a folder, not a database");
   EXPECT_EQ(open(Path("none/at/all.db")), Path("none/at/all.db") + ": unable to open the database file");
   EXPECT_EQ(open(Path("none.db"), false), Path("none.db") + ": there is no such database");
   EXPECT_FALSE(std::filesystem::exists(Path("none.db")));
@@ -90,21 +87,6 @@ TEST_F(SchemaTest, IsMadeOnceWhenSeveralProgramsOpenANewStoreAtATime) {
   for (const pid_t child : children) EXPECT_EQ(Wait(child), 0);
   EXPECT_EQ(Ask(Path(), "SELECT count(*) FROM tbSystem"), "6");
   EXPECT_EQ(Ask(Path(), "SELECT count(*) FROM tbSchemaVersion"), "1");
-}
-
-TEST_F(SchemaTest, KeepsTheIndexesOfTheImportFew) {
-  SqlHost::Open(Path());
-  const auto indexes = [&](const std::string& table) {
-    return Ask(Path(),
-               "SELECT group_concat(sql, ';') FROM sqlite_master WHERE type='index' AND tbl_name='" + table + "'");
-  };
-  EXPECT_EQ(indexes("tbOrder"),
-            "CREATE UNIQUE INDEX \"ixOrderByNumber\" ON \"tbOrder\"(\"VendorId\",\"PartnerId\",\"PONo\")");
-  EXPECT_EQ(indexes("tbOrderLine"), "CREATE INDEX \"ixOrderLineByOrder\" ON \"tbOrderLine\"(\"OrderId\")");
-  EXPECT_EQ(indexes("tbOrderLocn"), "CREATE INDEX \"ixOrderLocnByOrder\" ON \"tbOrderLocn\"(\"OrderId\")");
-  EXPECT_EQ(indexes("tbOrderLocnLine"), "CREATE INDEX \"ixOrderLocnLineByOrder\" ON \"tbOrderLocnLine\"(\"OrderId\")");
-  EXPECT_EQ(indexes("tbPartnerLocn"),
-            "CREATE UNIQUE INDEX \"ixPartnerLocnKey\" ON \"tbPartnerLocn\"(\"VendorId\",\"PartnerLocnNo\")");
 }
 
 }  // namespace

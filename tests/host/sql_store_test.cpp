@@ -1,6 +1,7 @@
 #include "host/sql_store.h"
 
 #include <limits>
+#include <tuple>
 #include <vector>
 
 #include "host/schema.h"
@@ -33,46 +34,30 @@ class SqlStoreTest : public StoreTest {
   SqlStore store_{session_};
 };
 
-void ExpectSame(const Sample& a, const Sample& b) {
-  EXPECT_EQ(a.Code, b.Code);
-  EXPECT_EQ(a.Note, b.Note);
-  EXPECT_EQ(a.Whole, b.Whole);
-  EXPECT_EQ(a.Long, b.Long);
-  EXPECT_EQ(a.Flag, b.Flag);
-  EXPECT_EQ(a.Real, b.Real);
-  EXPECT_EQ(a.Number, b.Number);
-  EXPECT_EQ(a.Date, b.Date);
-}
+auto Values(const Sample& s) { return std::tuple(s.Code, s.Note, s.Whole, s.Long, s.Flag, s.Real, s.Number, s.Date); }
 
 TEST_F(SqlStoreTest, GivesBackEveryKindOfMemberAsItWasStored) {
   using Limit = std::numeric_limits<double>;
   const Sample samples[] = {
       {0, "", Text(), 0, 0, false, 0, std::nullopt, std::nullopt},
-      {0, "empty note", Text(""), -1, -1, true, -0.5, 0.0, DateTime::FromYmd(2004, 7, 31)},
+      {0, "empty note", Text(""), -1, -1, true, 0.1 + 0.2, 0.0, DateTime::FromYmd(2004, 7, 31)},
       {0, std::string("nul\0inside", 10), Text(std::string("\0\xff\xc3(\r\n'\"", 8)), 2147483647, 9223372036854775807,
        true, 1e308, 99999999999.0, DateTime::FromYmdHms(1, 1, 1, 0, 0, 1)},
       {0, std::string("nul\0outside", 11), Text(std::string(300000, 'x')), -2147483647 - 1,
        std::int64_t{-9007199254740993}, false, -5e-324, Limit::max(), DateTime::FromYmdHms(9999, 12, 31, 23, 59, 59)},
-      {0, "tenths", Text("null after text"), 3, 4, false, 0.1 + 0.2, std::nullopt, std::nullopt},
       {0, "infinite", Text(), 5, 6, true, Limit::infinity(), -Limit::infinity(), std::nullopt},
   };
-  for (int pass = 1; pass <= 2; ++pass) {
-    for (const Sample& sample : samples) {
-      SCOPED_TRACE(sample.Code);
-      Sample stored = sample;
-      if (pass == 1) {
-        ExpectSame(sample, Stored(Added(sample)));
-      } else {
-        ASSERT_TRUE(Find(store_, Sample::kByCode, stored));
-        ExpectSame(sample, stored);
-      }
-    }
-    session_.Commit();
+  for (const Sample& sample : samples) {
+    EXPECT_EQ(Values(Stored(Added(sample))), Values(sample)) << sample.Code;
+    Sample found{.Code = sample.Code};
+    ASSERT_TRUE(Find(store_, Sample::kByCode, found));
+    EXPECT_EQ(Values(found), Values(sample)) << sample.Code;
   }
+  session_.Commit();
   EXPECT_EQ(Ask(Path(), "SELECT Date FROM tbSample WHERE SampleId=2"), "2004-07-31");
   EXPECT_EQ(Ask(Path(), "SELECT Date FROM tbSample WHERE SampleId=4"), "9999-12-31T23:59:59");
   EXPECT_EQ(Ask(Path(), "SELECT group_concat(typeof(Note)) FROM (SELECT Note FROM tbSample ORDER BY SampleId)"),
-            "null,text,text,text,text,null");
+            "null,text,text,text,null");
 }
 
 TEST_F(SqlStoreTest, GivesTheNextIdToARecordWithoutOne) {
@@ -87,19 +72,9 @@ TEST_F(SqlStoreTest, GivesTheNextIdToARecordWithoutOne) {
   EXPECT_EQ(beyond.SampleId, 0);
 }
 
-TEST_F(SqlStoreTest, LeavesTheRecordAloneThatItDoesNotFind) {
-  Sample sample{.SampleId = 9, .Code = "mine", .Note = "kept"};
-  EXPECT_FALSE(Load(store_, sample));
-  EXPECT_FALSE(Find(store_, Sample::kByCode, sample));
-  EXPECT_EQ(sample.Note, "kept");
-  EXPECT_FALSE(Update(store_, sample));
-  EXPECT_FALSE(Delete(store_, sample));
-  EXPECT_EQ(store_.NativeError(), 0);
-}
-
-TEST_F(SqlStoreTest, WritesByIdOrByKey) {
+TEST_F(SqlStoreTest, WritesByIdOrByKeyAndNothingThatItDoesNotFind) {
   const std::int32_t id = Added({.Code = "before", .Note = "n", .Whole = 1});
-  const std::int32_t other = Added({.Code = "other", .Note = "o", .Whole = 2});
+  const std::int32_t other = Added({.Code = "other", .Whole = 2});
   EXPECT_TRUE(Update(store_, Sample{.SampleId = id, .Code = "after", .Whole = 3}));
   EXPECT_EQ(Stored(id).Code, "after");
   EXPECT_EQ(Stored(id).Note, std::nullopt);
@@ -107,11 +82,16 @@ TEST_F(SqlStoreTest, WritesByIdOrByKey) {
   AddKeyed("A", 1, "one");
   AddKeyed("A", 2, "two");
   EXPECT_TRUE(Update(store_, Keyed{"A", 2, "deux"}));
-  Keyed keyed{"A", 2, {}};
-  ASSERT_TRUE(Load(store_, keyed));
-  EXPECT_EQ(keyed.Value, "deux");
   EXPECT_TRUE(Delete(store_, Keyed{"A", 1, {}}));
-  EXPECT_EQ(Count(store_, Keyed::kByOwner, Keyed{"A", 0, {}}), 1);
+  const auto left = Select(store_, Keyed::kByOwner, Keyed{"A", 0, {}});
+  ASSERT_EQ(left.size(), 1U);
+  EXPECT_EQ(left[0]->Value, "deux");
+
+  Sample mine{.SampleId = 9, .Code = "mine", .Note = "kept"};
+  EXPECT_FALSE(Load(store_, mine) || Find(store_, Sample::kByCode, mine));
+  EXPECT_EQ(mine.Note, "kept");
+  EXPECT_FALSE(Update(store_, mine) || Delete(store_, mine));
+  EXPECT_EQ(store_.NativeError(), 0);
 }
 
 TEST_F(SqlStoreTest, ReplacesWhatIsThereAndAddsWhatIsNot) {
@@ -127,11 +107,10 @@ TEST_F(SqlStoreTest, ReplacesWhatIsThereAndAddsWhatIsNot) {
   Keyed keyed{"K", 1, "old"}, again{"K", 1, "new"};
   EXPECT_TRUE(store_.ReplaceOrAdd(Keyed::kType, &keyed));
   EXPECT_TRUE(store_.ReplaceOrAdd(Keyed::kType, &again));
-  std::vector<std::string> codes;
-  ForEach<Sample>(store_, [&](const Sample& s) { codes.push_back(std::to_string(s.SampleId) + " " + s.Code); });
-  EXPECT_EQ(codes, (std::vector<std::string>{"1 second", "40 third", "41 fourth"}));
-  ASSERT_EQ(Select(store_, Keyed::kByOwner, keyed).size(), 1u);
-  EXPECT_EQ(Select(store_, Keyed::kByOwner, keyed)[0]->Value, "new");
+  std::string stored;
+  ForEach<Sample>(store_, [&](const Sample& s) { stored += std::to_string(s.SampleId) + " " + s.Code + ", "; });
+  ForEach<Keyed>(store_, [&](const Keyed& k) { stored += Str(k.Value); });
+  EXPECT_EQ(stored, "1 second, 40 third, 41 fourth, new");
 }
 
 TEST_F(SqlStoreTest, RefusesASecondRecordOfAUniqueLookupOrKeyWithTheDatabasesNumber) {
@@ -153,21 +132,20 @@ TEST_F(SqlStoreTest, RefusesASecondRecordOfAUniqueLookupOrKeyWithTheDatabasesNum
 
 TEST_F(SqlStoreTest, SelectsInTheOrderAddedAndFindsTheOldest) {
   for (const std::int32_t position : {30, 10, 20}) {
-    AddKeyed("A", position, std::to_string(position));
-    AddKeyed("B", position, "other owner");
+    AddKeyed("A", position, {});
+    AddKeyed("B", position, {});
     Added({.Code = "c" + std::to_string(position), .Note = "same", .Whole = position});
   }
-  std::vector<std::int32_t> order;
-  for (const auto& keyed : Select(store_, Keyed::kByOwner, Keyed{"A", 0, {}})) order.push_back(keyed->Position);
-  EXPECT_EQ(order, (std::vector<std::int32_t>{30, 10, 20}));
+  std::string added, sorted;
+  for (const auto& keyed : Select(store_, Keyed::kByOwner, Keyed{"A", 0, {}})) {
+    added += keyed->OwnerId + std::to_string(keyed->Position) + " ";
+  }
+  EXPECT_EQ(added, "A30 A10 A20 ");
   Sample oldest{.Note = "same"};
   ASSERT_TRUE(Find(store_, Sample::kByNote, oldest));
   EXPECT_EQ(oldest.Whole, 30);
-  std::vector<std::int32_t> sorted;
-  ForEach<Keyed>(store_, [&](const Keyed& keyed) {
-    if (keyed.OwnerId == "A") sorted.push_back(keyed.Position);
-  });
-  EXPECT_EQ(sorted, (std::vector<std::int32_t>{10, 20, 30}));
+  ForEach<Keyed>(store_, [&](const Keyed& keyed) { sorted += keyed.OwnerId + std::to_string(keyed.Position) + " "; });
+  EXPECT_EQ(sorted, "A10 A20 A30 B10 B20 B30 ");
 }
 
 TEST_F(SqlStoreTest, TellsNullFromEmptyInALookup) {
@@ -201,11 +179,9 @@ TEST_F(SqlStoreTest, PreparesEachStatementOnce) {
     Sample sample = Stored(id);
     EXPECT_TRUE(Find(store_, Sample::kByCode, sample));
     EXPECT_TRUE(Update(store_, sample));
-    EXPECT_GE(Count(store_, Sample::kByNote, sample), 1);
-    EXPECT_GE(Select(store_, Sample::kByNote, sample).size(), 1u);
-    if (n % 2 == 0) {
-      EXPECT_TRUE(Delete(store_, sample));
-    }
+    EXPECT_EQ(Count(store_, Sample::kByNote, sample), 1);
+    EXPECT_EQ(Select(store_, Sample::kByNote, sample).size(), 1u);
+    EXPECT_TRUE(Delete(store_, sample));
     session_.Commit();
   };
   round(0);

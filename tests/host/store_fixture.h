@@ -6,8 +6,6 @@
 #include <unistd.h>
 
 #include <array>
-#include <cstdlib>
-#include <filesystem>
 #include <functional>
 #include <memory>
 #include <optional>
@@ -16,8 +14,9 @@
 #include "host/soci.h"
 #include "host/sql_options.h"
 #include "partnerkit/record_type.h"
-#include "partnerkit/run_time_error.h"
 #include "partnerkit/values.h"
+#include "support/error_of.h"
+#include "support/trading_fixture.h"
 
 namespace partnerkit::host {
 
@@ -72,17 +71,7 @@ inline constexpr std::array<const RecordType*, 2> kTestTypes = {&Sample::kType, 
 
 class StoreTest : public ::testing::Test {
  protected:
-  StoreTest() {
-    std::string pattern = std::filesystem::temp_directory_path() / "partnerkit-host-XXXXXX";
-    if (mkdtemp(pattern.data()) == nullptr) std::abort();
-    folder_ = pattern;
-  }
-  ~StoreTest() override {
-    std::error_code ignored;
-    std::filesystem::remove_all(folder_, ignored);
-  }
-
-  std::string Path(std::string_view name = "store.db") const { return (folder_ / name).string(); }
+  std::string Path(std::string_view name = "store.db") const { return folder_ / name; }
 
   // The first column of the last row as another program sees it, or the error it gets.
   static std::string Ask(const std::string& path, const std::string& sql) {
@@ -99,14 +88,10 @@ class StoreTest : public ::testing::Test {
     return answer;
   }
 
-  // The text of the RunTimeError that the work raises, with its number in front unless it is the database's.
+  // What the work raises, without the number when it is the database's.
   static std::string ErrorOf(const std::function<void()>& work) {
-    try {
-      work();
-    } catch (const RunTimeError& error) {
-      return (error.Number() == run_time::kDatabase ? "" : std::to_string(error.Number()) + " ") + error.Description();
-    }
-    return "no error";
+    const std::string error = testing::ErrorOf(work);
+    return error.starts_with("40002 ") ? error.substr(6) : error;
   }
 
   // Runs the work in a process of its own, which ends without closing anything. Its connections have to be opened
@@ -129,7 +114,7 @@ class StoreTest : public ::testing::Test {
     return status;
   }
 
-  std::filesystem::path folder_;
+  testing::TempFolder folder_;
 };
 
 }  // namespace partnerkit::host

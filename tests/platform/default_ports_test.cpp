@@ -6,7 +6,6 @@
 #include <ctime>
 
 #include "partnerkit/platform.h"
-#include "platform/clocks.h"
 
 namespace partnerkit::platform {
 namespace {
@@ -31,12 +30,6 @@ TEST(DefaultPorts, NameTheComputerAndTheProgramAndAskNobody) {
   EXPECT_TRUE(ports.errorOutlets.libraryPath.ends_with("/" + ports.errorOutlets.applicationName));
   EXPECT_FALSE(ports.errorOutlets.dialog);
   EXPECT_TRUE(ports.files->Exists("/dev/null"));
-}
-
-TEST(FixedClock, StandsStill) {
-  FixedClock clock(DateTime::FromSeconds(1'141'726'500));
-  EXPECT_EQ(clock.Now().Iso(), "2006-03-07T10:15:00");
-  EXPECT_EQ(clock.Now().Iso(), "2006-03-07T10:15:00");
 }
 
 }  // namespace

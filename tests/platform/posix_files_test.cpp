@@ -10,47 +10,34 @@
 
 #include <array>
 #include <csignal>
-#include <cstdlib>
 #include <filesystem>
-#include <fstream>
 #include <iterator>
+
+#include "support/error_of.h"
+#include "support/trading_fixture.h"
 
 namespace partnerkit::platform {
 namespace {
 
-constexpr int kFree = 0;
-constexpr int kHeld = 1;
 constexpr int kUnprivilegedUser = 65534;
 
-class PosixFilesTest : public testing::Test {
- protected:
-  PosixFilesTest() {
-    std::string name = (std::filesystem::temp_directory_path() / "posix_files.XXXXXX").string();
-    folder_ = mkdtemp(name.data());
-    std::filesystem::permissions(folder_, std::filesystem::perms::all);
-  }
-  ~PosixFilesTest() override { std::filesystem::remove_all(folder_); }
+using testing::ErrorOf;
 
-  std::string Path(const std::string& name) const { return folder_ + "/" + name; }
+class PosixFilesTest : public ::testing::Test {
+ protected:
+  PosixFilesTest() { std::filesystem::permissions(Path(""), std::filesystem::perms::all); }
+
+  std::string Path(const std::string& name) const { return folder_ / name; }
   std::string Put(const std::string& name, const std::string& bytes) const {
-    std::ofstream(Path(name), std::ios::binary) << bytes;
+    folder_.Write(name, bytes);
     return Path(name);
   }
-  static std::string Bytes(const std::string& path) {
-    std::ifstream file(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(file), {}};
-  }
+  std::string Bytes(const std::string& path) const { return folder_.Read(path); }
 
-  // The number that `operation` raises, 0 for none; its description goes to `said_`.
-  template <class F>
-  int NumberOf(F operation) {
-    try {
-      operation();
-      return 0;
-    } catch (const RunTimeError& error) {
-      said_ = error.Description();
-      return error.Number();
-    }
+  // The number that `operation` raises, 0 for none.
+  static int NumberOf(const std::function<void()>& operation) {
+    const std::string error = ErrorOf(operation);
+    return error.empty() ? 0 : std::stoi(error);
   }
 
   // What `run` gives in another process, -1 when that process died.
@@ -63,81 +50,64 @@ class PosixFilesTest : public testing::Test {
     return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
   }
 
-  static int TryFlock(const std::string& path, int kind) {
-    return InChild([&] { return flock(open(path.c_str(), O_RDWR), kind | LOCK_NB) == 0 ? kFree : kHeld; });
-  }
-  static int TryByteLock(const std::string& path, short kind) {
-    return InChild([&] {
+  // Whether another program may share and have the file, first by flock, then by a lock of a byte: "-" for each that it
+  // may not.
+  static std::string Locks(const std::string& path) {
+    std::string locks;
+    for (const int kind : {LOCK_SH, LOCK_EX}) {
+      const bool free = InChild([&] { return flock(open(path.c_str(), O_RDWR), kind | LOCK_NB); }) == 0;
+      locks += free ? 'f' : '-';
+    }
+    for (const bool alone : {false, true}) {
       struct flock oneByte {};
-      oneByte.l_type = kind;
+      oneByte.l_type = alone ? F_WRLCK : F_RDLCK;
       oneByte.l_start = 3;
       oneByte.l_len = 1;
-      return fcntl(open(path.c_str(), O_RDWR), F_SETLK, &oneByte) == 0 ? kFree : kHeld;
-    });
+      const bool free = InChild([&] { return fcntl(open(path.c_str(), O_RDWR), F_SETLK, &oneByte); }) == 0;
+      locks += free ? 'b' : '-';
+    }
+    return locks;
   }
 
-  std::string folder_;
-  std::string said_;
+  testing::TempFolder folder_;
   PosixFiles files_;
 };
 
 TEST_F(PosixFilesTest, TurnsProgramsOfEitherLockCustomAwayWhileAFileIsHeld) {
-  struct Case {
-    const char* name;
-    bool output;
-    Share share;
-    int toRead, toWrite;
-  };
-  for (const Case& c : {Case{"exclusive", false, Share::kExclusive, kHeld, kHeld},
-                        Case{"deny write", false, Share::kDenyWrite, kFree, kHeld},
-                        Case{"output", true, Share::kExclusive, kHeld, kHeld}}) {
-    SCOPED_TRACE(c.name);
-    const std::string path = Put("held.csv", "12345");
-    std::unique_ptr<InputFile> input;
-    std::unique_ptr<OutputFile> output;
-    if (c.output) {
-      output = files_.OpenOutput(path, OutputMode::kAppend);
-    } else {
-      input = files_.OpenInput(path, c.share);
-    }
-    EXPECT_EQ(TryFlock(path, LOCK_SH), c.toRead);
-    EXPECT_EQ(TryFlock(path, LOCK_EX), c.toWrite);
-    EXPECT_EQ(TryByteLock(path, F_RDLCK), c.toRead);
-    EXPECT_EQ(TryByteLock(path, F_WRLCK), c.toWrite);
-    input.reset();
-    output.reset();
-    EXPECT_EQ(TryFlock(path, LOCK_EX), kFree);
-    EXPECT_EQ(TryByteLock(path, F_WRLCK), kFree);
+  const std::string path = Put("held.csv", "12345");
+  {
+    const auto file = files_.OpenInput(path, Share::kExclusive);
+    EXPECT_EQ(Locks(path), "----");
   }
+  {
+    const auto file = files_.OpenInput(path, Share::kDenyWrite);
+    EXPECT_EQ(Locks(path), "f-b-");
+  }
+  {
+    const auto file = files_.OpenOutput(path, OutputMode::kAppend);
+    EXPECT_EQ(Locks(path), "----");
+  }
+  EXPECT_EQ(Locks(path), "ffbb");
 }
 
 TEST_F(PosixFilesTest, RefusesAFileThatAnotherProgramHoldsAndLeavesItsBytes) {
   const std::string path = Put("theirs.csv", "their bytes");
   for (const bool byFlock : {true, false}) {
     SCOPED_TRACE(byFlock);
-    std::array<int, 2> ready{}, done{};
-    ASSERT_EQ(pipe(ready.data()) + pipe(done.data()), 0);
-    const pid_t holder = fork();
-    if (holder == 0) {
-      close(done[1]);
-      const int held = open(path.c_str(), O_RDWR);
-      struct flock whole {};
-      whole.l_type = F_WRLCK;
-      const bool ok = byFlock ? flock(held, LOCK_EX) == 0 : fcntl(held, F_SETLK, &whole) == 0;
-      char sign = ok ? 'h' : 'x';
-      _exit(write(ready[1], &sign, 1) == 1 && read(done[0], &sign, 1) == 0 ? 0 : 1);
-    }
-    char sign = ' ';
-    ASSERT_EQ(read(ready[0], &sign, 1), 1);
-    ASSERT_EQ(sign, 'h');
-    EXPECT_EQ(NumberOf([&] { files_.OpenInput(path, Share::kExclusive); }), 70);
-    EXPECT_EQ(said_, "Permission denied: " + path + ": The file is in use");
-    EXPECT_EQ(NumberOf([&] { files_.OpenInput(path, Share::kDenyWrite); }), 70);
-    EXPECT_EQ(NumberOf([&] { files_.OpenOutput(path, OutputMode::kAppend); }), 70);
-    EXPECT_EQ(NumberOf([&] { files_.OpenOutput(path, OutputMode::kReplace); }), 70);
+    const int theirs = open(path.c_str(), O_RDWR);
+    struct flock whole {};
+    whole.l_type = F_WRLCK;
+    ASSERT_EQ(byFlock ? flock(theirs, LOCK_EX) : fcntl(theirs, F_SETLK, &whole), 0);
+    EXPECT_EQ(InChild([&] {
+                const std::string inUse = ErrorOf([&] { files_.OpenInput(path, Share::kExclusive); });
+                if (inUse != "70 Permission denied: " + path + ": The file is in use") return 1;
+                if (NumberOf([&] { files_.OpenInput(path, Share::kDenyWrite); }) != 70) return 2;
+                if (NumberOf([&] { files_.OpenOutput(path, OutputMode::kAppend); }) != 70) return 3;
+                return NumberOf([&] { files_.OpenOutput(path, OutputMode::kReplace); }) == 70 ? 0 : 4;
+              }),
+              0);
     EXPECT_EQ(Bytes(path), "their bytes");
-    for (const int end : {done[1], done[0], ready[0], ready[1]}) close(end);
-    waitpid(holder, nullptr, 0);
+    close(theirs);
     EXPECT_EQ(NumberOf([&] { files_.OpenInput(path, Share::kExclusive); }), 0);
   }
 }
@@ -195,7 +165,6 @@ TEST_F(PosixFilesTest, ReadsAnywhereInAFile) {
   EXPECT_EQ(file->Length(), 8u);
   EXPECT_EQ(std::string(read.data(), file->ReadAt(4, read)), "efg");
   EXPECT_EQ(std::string(read.data(), file->ReadAt(7, read)), "h");
-  EXPECT_EQ(file->ReadAt(8, read), 0u);
   EXPECT_EQ(file->ReadAt(0xFFFFFFFFFFFFFFFF, read), 0u);
 }
 
@@ -223,31 +192,12 @@ TEST_F(PosixFilesTest, AppendsReplacesAndCutsBack) {
   EXPECT_EQ(files_.Length(path), 0u);
 }
 
-TEST_F(PosixFilesTest, WritesMoreThanItsBufferHolds) {
-  const std::string path = Path("large.csv");
-  const auto file = files_.OpenOutput(path, OutputMode::kReplace);
-  std::string expected;
-  for (const std::size_t size : {1000u, 262'144u, 3u, 700'000u}) {
-    const std::string piece(size, static_cast<char>('a' + size % 26));
-    file->Write(piece);
-    expected += piece;
-  }
-  file->Close();
-  EXPECT_EQ(Bytes(path), expected);
-}
-
 TEST_F(PosixFilesTest, TellsWhatIsWrongWithAPath) {
   std::filesystem::create_directory(Path("folder"));
   mkfifo(Path("pipe").c_str(), 0666);
   const std::string file = Put("plain.csv", "x");
   const std::string nul = Path(std::string("a\0b", 3));
   const std::string tooLong = Path(std::string(300, 'n'));
-  const auto input = [&](const std::string& path) {
-    return NumberOf([&] { files_.OpenInput(path, Share::kExclusive); });
-  };
-  const auto output = [&](const std::string& path) {
-    return NumberOf([&] { files_.OpenOutput(path, OutputMode::kReplace); });
-  };
   struct Case {
     std::string path;
     int length, input, output, remove, rename;
@@ -258,17 +208,17 @@ TEST_F(PosixFilesTest, TellsWhatIsWrongWithAPath) {
                         Case{Path("pipe"), 0, 75, 57, 0, 53}, Case{"", 53, 53, 53, 53, 53}}) {
     SCOPED_TRACE(c.path);
     EXPECT_EQ(NumberOf([&] { files_.Length(c.path); }), c.length);
-    EXPECT_EQ(input(c.path), c.input);
-    EXPECT_EQ(output(c.path), c.output);
+    EXPECT_EQ(NumberOf([&] { files_.OpenInput(c.path, Share::kExclusive); }), c.input);
+    EXPECT_EQ(NumberOf([&] { files_.OpenOutput(c.path, OutputMode::kReplace); }), c.output);
     EXPECT_EQ(NumberOf([&] { files_.Delete(c.path); }), c.remove);
     EXPECT_EQ(NumberOf([&] { files_.Rename(c.path, Path("renamed")); }), c.rename);
     EXPECT_FALSE(files_.Exists(c.path));
   }
   EXPECT_TRUE(files_.Exists(file));
-  EXPECT_EQ(input(Path("none/x.csv")), 76);
-  EXPECT_EQ(said_, "Path not found: " + Path("none/x.csv") + ": No such file or directory");
-  EXPECT_EQ(input(nul), 52);
-  EXPECT_EQ(said_, "Bad file name or number: " + Path("a?b") + ": A name cannot hold a NUL byte");
+  EXPECT_EQ(ErrorOf([&] { files_.OpenInput(Path("none/x.csv"), Share::kExclusive); }),
+            "76 Path not found: " + Path("none/x.csv") + ": No such file or directory");
+  EXPECT_EQ(ErrorOf([&] { files_.OpenInput(nul, Share::kExclusive); }),
+            "52 Bad file name or number: " + Path("a?b") + ": A name cannot hold a NUL byte");
 }
 
 TEST_F(PosixFilesTest, HoldsAFileThatItMayOnlyReadAndSaysThatItMayNotWrite) {
@@ -282,8 +232,8 @@ TEST_F(PosixFilesTest, HoldsAFileThatItMayOnlyReadAndSaysThatItMayNotWrite) {
               if (NumberOf([&] { files_.OpenInput(readable, Share::kExclusive); }) != 70) return 2;
               if (NumberOf([&] { files_.OpenOutput(readable, OutputMode::kAppend); }) != 75) return 3;
               if (NumberOf([&] { files_.OpenInput(secret, Share::kDenyWrite); }) != 75) return 4;
-              if (NumberOf([&] { files_.OpenOutput("/etc/none.csv", OutputMode::kReplace); }) != 75) return 5;
-              return said_ == "Path/File access error: /etc/none.csv: Permission denied" ? 0 : 6;
+              const std::string denied = ErrorOf([&] { files_.OpenOutput("/etc/none.csv", OutputMode::kReplace); });
+              return denied == "75 Path/File access error: /etc/none.csv: Permission denied" ? 0 : 5;
             }),
             0);
 }
@@ -291,8 +241,7 @@ TEST_F(PosixFilesTest, HoldsAFileThatItMayOnlyReadAndSaysThatItMayNotWrite) {
 TEST_F(PosixFilesTest, TellsAFullDiskAndGoesOnWhereItStoodOnceThereIsRoom) {
   const auto full = files_.OpenOutput("/dev/full", OutputMode::kReplace);
   full->Write("lost");
-  EXPECT_EQ(NumberOf([&] { full->Close(); }), 61);
-  EXPECT_EQ(said_, "Disk full: /dev/full: No space left on device");
+  EXPECT_EQ(ErrorOf([&] { full->Close(); }), "61 Disk full: /dev/full: No space left on device");
 
   const std::string path = Path("limited.csv");
   EXPECT_EQ(InChild([&] {
@@ -340,35 +289,31 @@ TEST_F(PosixFilesTest, RenamesInThePlaceOfAFileThatSomebodyReads) {
 
   std::filesystem::create_directory(Path("folder"));
   EXPECT_EQ(NumberOf([&] { files_.Rename(to, Path("folder")); }), 75);
-  EXPECT_EQ(NumberOf([&] { files_.Rename(to, Path("none/to.csv")); }), 76);
-  EXPECT_EQ(said_, "Path not found: " + Path("none/to.csv") + ": No such file or directory");
+  EXPECT_EQ(ErrorOf([&] { files_.Rename(to, Path("none/to.csv")); }),
+            "76 Path not found: " + Path("none/to.csv") + ": No such file or directory");
   files_.Rename(to, Path("folder/moved.csv"));
   EXPECT_EQ(Bytes(Path("folder/moved.csv")), "new");
 }
 
 TEST_F(PosixFilesTest, CopiesIntoThePlaceOfAnOlderFile) {
-  PosixFiles files;
-  files.CreateFolder(Path("archive"));
-  EXPECT_EQ(NumberOf([&] { files.CreateFolder(Path("archive")); }), run_time::kPathAccess);
-  EXPECT_EQ(NumberOf([&] { files.CreateFolder(Path("gone/archive")); }), run_time::kPathNotFound);
+  files_.CreateFolder(Path("archive"));
+  EXPECT_EQ(NumberOf([&] { files_.CreateFolder(Path("archive")); }), 75);
+  EXPECT_EQ(NumberOf([&] { files_.CreateFolder(Path("gone/archive")); }), 76);
   const std::string from = Put("orders.txt", std::string(300'000, 'o')), to = Put("archive/orders.txt", "older");
-  const auto held = files.OpenInput(from, Share::kExclusive);
-  files.Copy(from, to);
+  const auto held = files_.OpenInput(from, Share::kExclusive);
+  files_.Copy(from, to);
   EXPECT_EQ(Bytes(to), std::string(300'000, 'o'));
-  const struct {
-    std::string from, to;
-    int number;
-  } cases[] = {
-      {"none.txt", "archive/orders.txt", run_time::kFileNotFound}, {"archive", "copy", run_time::kPathAccess},
-      {"orders.txt", "gone/orders.txt", run_time::kPathNotFound},  {"orders.txt", "archive", run_time::kPathAccess},
-      {"orders.txt", "orders.txt", run_time::kPathAccess},
+  const auto expectError = [&](const std::string& source, const std::string& target, int number) {
+    EXPECT_EQ(NumberOf([&] { files_.Copy(Path(source), Path(target)); }), number) << source << " to " << target;
   };
-  for (const auto& c : cases) {
-    EXPECT_EQ(NumberOf([&] { files.Copy(Path(c.from), Path(c.to)); }), c.number) << c.from << " to " << c.to;
-  }
+  expectError("none.txt", "archive/orders.txt", 53);
+  expectError("archive", "copy", 75);
+  expectError("orders.txt", "gone/orders.txt", 76);
+  expectError("orders.txt", "archive", 75);
+  expectError("orders.txt", "orders.txt", 75);
   EXPECT_EQ(Bytes(to), std::string(300'000, 'o'));
   EXPECT_EQ(Bytes(from), Bytes(to));
-  EXPECT_EQ(std::distance(std::filesystem::directory_iterator(folder_), {}), 2);
+  EXPECT_EQ(std::distance(std::filesystem::directory_iterator(Path("")), {}), 2);
 }
 
 TEST_F(PosixFilesTest, RenamesAnewButNeverInThePlaceOfAFile) {
