@@ -57,6 +57,8 @@ std::int32_t CompileFrame::Load(const std::string& a_sFileName, RowTable& a_vtRo
     interrupted.PartnerId = Document().PartnerId;
     TakeUpInterrupted(PendingNotice::kByVendorAndPartner, interrupted,
                       [&](std::string_view told) { WriteLog(kWarning, "Load", told); });
+    Try([&] { NoticeFiles::RemoveUnwritten(FileSystem(), output_); });
+    if (inventoryOn_) Try([&] { NoticeFiles::RemoveUnwritten(FileSystem(), inventoryPath_); });
     Host().PackListMode = 0;
     const PackPointers packs = Try([&] { return Host().PacksToCompile(Document().VendorId, Document().PartnerId); });
     if (packs.empty()) {

@@ -104,12 +104,18 @@ bool NoticeFiles::Abandon() {
   return all;
 }
 
+bool NoticeFiles::RemoveUnwritten(Files& files, const std::string& path) {
+  const std::string name = NameUntilWritten(path);
+  if (!files.Exists(name)) return true;
+  const auto held = OpenUnlessInUse(files, name);
+  if (held == nullptr) return false;
+  if (held->Length() == 0) files.Delete(name);
+  return true;
+}
+
 NoticeFiles::TakenBack NoticeFiles::TakeBack(Files& files, const FileGrowth& growth) {
-  const std::string unnamed = NameUntilWritten(growth.path);
-  if (growth.isNew && files.Exists(unnamed)) {
-    const auto held = OpenUnlessInUse(files, unnamed);
-    if (held == nullptr) return TakenBack::kInUse;
-    if (held->Length() == 0) files.Delete(unnamed);
+  if (growth.isNew && files.Exists(NameUntilWritten(growth.path))) {
+    if (!RemoveUnwritten(files, growth.path)) return TakenBack::kInUse;
     if (!files.Exists(growth.path)) return TakenBack::kUntouched;
   }
   if (!files.Exists(growth.path)) return TakenBack::kChanged;

@@ -50,7 +50,9 @@ class NoticeFiles {
     kCutBack,    // it had, and is as it was before
     kChanged,    // it was added to by others since, or replaced, or is gone: nothing is done
   };
-  // The same after a killed run.
+  // Deletes what a killed run left of a file that was still to be made. False while another program has it.
+  static bool RemoveUnwritten(Files& files, const std::string& path);
+  // What Abandon does, after a killed run.
   static TakenBack TakeBack(Files& files, const FileGrowth& growth);
 
  private:
