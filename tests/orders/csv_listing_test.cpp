@@ -5,7 +5,6 @@
 
 #include "orders/csv/csv_classes.h"
 #include "support/csv_orders.h"
-#include "support/faulty_files.h"
 #include "support/other_program.h"
 
 namespace partnerkit::testing {
@@ -14,37 +13,6 @@ namespace {
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using namespace std::string_literals;
-
-constexpr const char* kMgb = "clsMGB850csv";
-
-using Texts = std::vector<std::string>;
-
-// A row each, its cells with a blank between: what `Load` lists of an order file.
-Texts Listed(CsvTrade& trade, std::string_view orders) {
-  trade.WriteOrders(orders);
-  const auto importer = trade.Start();
-  RowTable table;
-  const std::int32_t rows = importer->Load(trade.OrdersPath(), table);
-  EXPECT_EQ(static_cast<std::size_t>(rows), table.Rows());
-  importer->Cancel();
-  EXPECT_EQ(trade.Orders(), orders);
-  return Rows(table);
-}
-
-TEST(CsvListingTest, ShowsTheGridOfTheOrderImporters) {
-  CsvTrade trade(kMgb);
-  const auto importer = trade.Create(kMgb);
-  importer->PROCESSALL = true;
-  ColumnTable table;
-  EXPECT_TRUE(importer->Init(*trade.system, 1, table));
-  Texts columns;
-  for (const auto& [caption, kind, width] : table) {
-    columns.push_back(std::string(caption) + ", " + std::to_string(kind) + ", " + std::to_string(width));
-  }
-  EXPECT_THAT(columns, ElementsAre("PO Number, 0, 2600", "Date, 2, 1300", "Trans Set, 0, 2000", "Result, 0, 3000"));
-  EXPECT_FALSE(importer->PROCESSALL);
-  EXPECT_EQ(importer->ProgId(), "PartnerKit.clsMGB850csv");
-}
 
 TEST(CsvListingTest, ListsARowForEachOfItsTransactions) {
   CsvTrade lines(kMgb);
@@ -57,149 +25,131 @@ TEST(CsvListingTest, ListsARowForEachOfItsTransactions) {
   std::string lone = one + other;
   std::erase(lone, '\n');
   const struct {
-    std::string what, className, orders;
+    std::string what, orders;
     Texts rows;
   } cases[] = {
       // clang-format off
-      {"lines of one order", kMgb, one + second, {row}},
-      {"two orders", kMgb, one + second + other, {row, otherRow}},
-      {"equal control numbers, first line again", kMgb, one + second + one + second, {row, row}},
-      {"an order number alone starts nothing", kMgb, one + line("PONUMBER=450009"), {row}},
-      {"others' orders", kMgb, foreign + foreign + one + stranger + second + foreign, {row}},
-      {"control numbers count as joined", kMgb, one + line("INTCONTROLNO=100; GRPCONTROLNO=1202; BIN=2"),
+      {"lines of one order", one + second, {row}},
+      {"equal control numbers, first line again", one + second + one + second, {row, row}},
+      {"an order number alone starts nothing", one + line("PONUMBER=450009"), {row}},
+      {"others' orders", foreign + foreign + one + stranger + second + foreign, {row}},
+      {"control numbers count as joined", one + line("INTCONTROLNO=100; GRPCONTROLNO=1202; BIN=2"),
        {row, "450001 2006-03-01 100/1202/33"}},
-      {"blank lines", kMgb, "\r\n" + one + "\r\n\r\n" + other, {row, otherRow}},
-      {"blanks round fields", kMgb, line("PONUMBER=  450001 ; PARTNEREDIADDR= MGBSTORES "), {row}},
-      {"quoted fields", kMgb, line("PONUMBER=\"450001\"; INTCONTROLNO=\"1001\""), {row}},
-      {"a missing quote", kMgb, line("PONUMBER=\"450001"), {"\"450001 2006-03-01 1001/202/33"}},
-      {"a date in parts", kMgb, line("PODATE=06/3/1"), {row}},
-      {"a date of six", kMgb, line("PODATE=990301"), {"450001 1999-03-01 1001/202/33"}},
-      {"no such day", kMgb, line("PODATE=20040231"), {"450001 empty 1001/202/33"}},
-      {"no date", kMgb, line("PODATE=soon"), {"450001 empty 1001/202/33"}},
-      {"lone CRs, the last line without end", kMgb, lone.substr(0, lone.size() - 1), {row, otherRow}},
-      {"a NUL byte", kMgb, line("PONUMBER=45\0001"s), {"45\0001 2006-03-01 1001/202/33"s}},
-      {"columns without end", kMgb, one.substr(0, one.size() - 2) + std::string(100'000, ','), {row}},
+      {"blank lines", "\r\n" + one + "\r\n\r\n" + other, {row, otherRow}},
+      {"blanks round fields", line("PONUMBER=  450001 ; PARTNEREDIADDR= MGBSTORES "), {row}},
+      {"a missing quote", line("PONUMBER=\"450001"), {"\"450001 2006-03-01 1001/202/33"}},
+      {"a date in parts", line("PODATE=06/3/1"), {row}},
+      {"no such day", line("PODATE=20040231"), {"450001 empty 1001/202/33"}},
+      {"lone CRs, the last line without end", lone.substr(0, lone.size() - 1), {row, otherRow}},
+      {"a NUL byte", line("PONUMBER=45\0001"s), {"45\0001 2006-03-01 1001/202/33"s}},
+      {"columns without end", one.substr(0, one.size() - 2) + std::string(100'000, ','), {row}},
       // clang-format on
   };
   for (const auto& c : cases) {
     SCOPED_TRACE(c.what);
-    CsvTrade trade(c.className);
-    EXPECT_EQ(Listed(trade, c.orders), c.rows);
+    CsvTrade trade(kMgb);
+    EXPECT_EQ(trade.Listed(c.orders), c.rows);
+    EXPECT_EQ(trade.Orders(), c.orders);
     EXPECT_THAT(trade.NewLog(), IsEmpty());
     EXPECT_THAT(trade.reports, IsEmpty());
   }
 }
 
 TEST(CsvListingTest, TellsWhyNothingWasListed) {
-  const std::string missing =
-      "W OpenMapFile: Expected field INTCONTROLNO not found. \r\n Add this item to your orders.map file.";
-  const std::string wide = "4\0005\0000\0000\0000\0001\000"s;
   const struct {
-    std::string what, className;
+    std::string what;
     std::function<void(CsvTrade&)> arrange;
     std::string log;
+    std::string held = {};  // by another program
   } cases[] = {
       // clang-format off
-      {"no order file", kMgb, [](CsvTrade& t) { std::filesystem::remove(t.OrdersPath()); },
-       "53 SetOrderList: File {}/in/orders.txt does not exist."},
-      {"no folder", kMgb, [](CsvTrade& t) { std::filesystem::remove_all(t.folder / "in"); },
-       "76 SetOrderList: File {}/in/orders.txt does not exist."},
-      {"empty order file", kMgb, [](CsvTrade& t) { t.WriteOrders(""); },
-       "0 SetOrderList: File {}/in/orders.txt is empty."},
-      {"no order of ours", kMgb, [](CsvTrade& t) { t.document.PartnerEDIAddr = "MYER"; },
+      {"no order file", [](CsvTrade& t) { std::filesystem::remove(t.OrdersPath()); },
+       "53 SetOrderList: File {}in/orders.txt does not exist."},
+      {"empty order file", [](CsvTrade& t) { t.WriteOrders(""); }, "0 SetOrderList: File {}in/orders.txt is empty."},
+      {"no order of ours", [](CsvTrade& t) { t.document.PartnerEDIAddr = "MYER"; },
        "0 Load: No orders found to match EDI addresses."},
-      {"UTF-16 order file", kMgb, [&](CsvTrade& t) { t.WriteOrders("\xFF\xFE" + wide + "\r\0\n\0"s); },
-       "0 Load: No orders found to match EDI addresses."},
-      {"no map", kMgb, [](CsvTrade& t) { t.document.MapFile = "none.map"; },
-       "53 OpenMapFile: PO map file {}/none.map does not exist."},
-      {"a map that is a folder", kMgb, [](CsvTrade& t) { t.document.MapFile = "in"; },
-       "75 OpenMapFile: PO map file {}/in does not exist."},
-      {"empty map", kMgb, [](CsvTrade& t) { t.folder.Write("orders.map", ""); },
-       "0 OpenMapFile: PO map file {}/orders.map is empty."},
-      {"UTF-16 map", kMgb, [&](CsvTrade& t) { t.folder.Write("orders.map", "\xFF\xFE" + wide); }, missing},
-      {"a map in lower case", kMgb, [](CsvTrade& t) { t.folder.Write("orders.map", "intcontrolno\n"); }, missing},
+      {"no map", [](CsvTrade& t) { t.document.MapFile = "none.map"; },
+       "53 OpenMapFile: PO map file {}none.map does not exist."},
+      {"empty map", [](CsvTrade& t) { t.folder.Write("orders.map", ""); },
+       "0 OpenMapFile: PO map file {}orders.map is empty."},
+      {"a map in lower case", [](CsvTrade& t) { t.folder.Write("orders.map", "intcontrolno\n"); },
+       "W OpenMapFile: Expected field INTCONTROLNO not found. \r\n Add this item to your orders.map file."},
+      {"held order file", [](CsvTrade&) {}, "70 SetOrderList: Error opening file {}in/orders.txt", "in/orders.txt"},
+      {"held map", [](CsvTrade&) {}, "70 OpenMapFile: Error opening file {}orders.map", "orders.map"},
+      {"held backup", [](CsvTrade& t) { t.UseBackup(); t.folder.Write("backup.txt", ""); },
+       "70 Init: PO import cannot proceed. Backupfile {}backup.txt could not be opened.", "backup.txt"},
       // clang-format on
   };
   for (const auto& c : cases) {
     SCOPED_TRACE(c.what);
-    CsvTrade trade(c.className);
+    CsvTrade trade(kMgb);
     trade.WriteOrders(trade.Line());
     c.arrange(trade);
+    std::optional<OtherProgram> other;
+    if (!c.held.empty()) other.emplace(trade.folder / c.held);
     const auto importer = trade.Start();
+    EXPECT_EQ(trade.initialised, c.held != "backup.txt");
     RowTable table(7, 1);
-    EXPECT_EQ(importer->Load(trade.OrdersPath(), table), 0);
-    EXPECT_EQ(table.Rows(), 7U);
-    std::string log = c.log;
-    if (const auto at = log.find("{}"); at != std::string::npos) {
-      log.replace(at, 3, trade.folder / "");
+    if (trade.initialised) {
+      EXPECT_EQ(importer->Load(trade.OrdersPath(), table), 0);
     }
-    EXPECT_THAT(trade.NewLog(), ElementsAre(log));
+    EXPECT_EQ(table.Rows(), 7U);
+    EXPECT_THAT(trade.NewLog(), ElementsAre(Replaced(c.log, "{}", trade.folder / "")));
     EXPECT_THAT(trade.reports, IsEmpty());
   }
 }
 
-TEST(CsvListingTest, TellsWhichFileIsHeldByAnotherProgram) {
-  CsvTrade trade(kMgb);
-  trade.UseBackup();
-  trade.WriteOrders(trade.Line());
-  trade.folder.Write("backup.txt", "");
-  const struct {
-    std::string file;
-    bool initialised;
-    std::string log;
-  } cases[] = {
-      {"in/orders.txt", true, "70 SetOrderList: Error opening file "},
-      {"orders.map", true, "70 OpenMapFile: Error opening file "},
-      {"backup.txt", false, "70 Init: PO import cannot proceed. Backupfile "},
-  };
-  for (const auto& c : cases) {
-    const OtherProgram other(trade.folder / c.file);
-    const auto importer = trade.Start();
-    EXPECT_EQ(trade.initialised, c.initialised);
-    if (trade.initialised) {
-      RowTable table;
-      EXPECT_EQ(importer->Load(trade.OrdersPath(), table), 0);
-    }
-    EXPECT_THAT(trade.NewLog(),
-                ElementsAre(c.log + (trade.folder / c.file) + (c.initialised ? "" : " could not be opened.")));
-  }
-  EXPECT_EQ(trade.Import().rows, 1);
-}
-
 // Lines of the map that name nothing expected, and names that come twice, are no fault.
-TEST(CsvListingTest, ExpectsEachOfItsFieldsInTheMap) {
+TEST(CsvListingTest, ExpectsItsFieldsInTheMapAndNoOthers) {
+  const std::string gtinAdded =
+      "INTDATE RESPONSETYPECODE DELIVERYPARTY REQUIRED TRADEDQUANTITY DELDATE PROMODATE STATUS INNEREAN INNERQTY";
+  const std::string gtinRemoved =
+      "CUSTCAT DEPTNO ADDATE STOREZONE UNITMEASURECODE ORDERQUANTITY SKUPRODUCTKEYCODE RETAILUNITPRICE";
+  const std::string packs = "POVERSIONNO CARTONSOUTER UNITSINNERPACK PACKUOM";
   const struct {
-    std::string className, fields;
+    std::string className, added, removed;  // beside the usual ones, and of them
   } cases[] = {
-      {kMgb,
-       "INTCONTROLNO GRPCONTROLNO TRNCONTROLNO PARTNEREDIADDR COMPANYEDIADDR POPURPOSECODE POTYPECODE PONUMBER PODATE "
-       "SUPPLIERNO CUSTCAT DEPTNO NOTBEFORE CANCAFTER ADDATE STOREZONE BUYINGLOCPARTNERNO SHIPTOLOCPARTNERNO "
-       "SEQUENTIALLINENO PRODUCTQUALIFIER INCOMINGPRODUCTNO UNITMEASURECODE UNITPRICECODE UNITPRICE ORDERQUANTITY "
-       "SKUPRODUCTKEYCODE RETAILUNITPRICE ALLOCATEQUANTITY CUSTOMERREF CUSTOMERNO STYLE COLOUR SIZE DESCRIPTION WEIGHT "
-       "VOLUME BIN LINEREF"},
+      // clang-format off
+      {kMgb, "", ""},
+      {kMyer, "", ""},
+      {kGhpl, "", "SUPPLIERNO CUSTCAT STOREZONE"},
+      {kTarget, "CONTRACTNO HEADER1 UNITSINNERPACK PACKUOM", "SUPPLIERNO CUSTCAT DEPTNO"},
+      {kMgbbt, "", ""},
+      {kKmart, packs, "CUSTCAT SKUPRODUCTKEYCODE RETAILUNITPRICE"},
+      {kOfficeworks, packs, "CUSTCAT DEPTNO STOREZONE SKUPRODUCTKEYCODE RETAILUNITPRICE"},
+      {kCml, gtinAdded, gtinRemoved},
+      {kBulk, gtinAdded + " UNITSINNERPACK", gtinRemoved},
+      {kColes, "INTDATE RESPONSETYPECODE EQUIPMENT DELIVERYPARTY REQUIRED HEADER1 HEADER2 HEADER3 HEADER4 HEADER5 "
+       "DESTDOCK DELDOCK PALLETFOOTAGE UNITPRICEINCGST UNITPRICEEXGST GSTRATE CARTONSOUTER PACKUOM UNITSINNERPACK "
+       "GSTAMOUNT STATUS INNEREAN INNERQTY DETAIL4 DETAIL5",
+       "CUSTCAT DEPTNO ADDATE STOREZONE UNITPRICE RETAILUNITPRICE"},
+      // clang-format on
+  };
+  const auto words = [](const std::string& text) {
+    std::istringstream stream(text);
+    return Texts{std::istream_iterator<std::string>(stream), std::istream_iterator<std::string>()};
   };
   for (const auto& c : cases) {
-    CsvTrade trade(c.className);
+    SCOPED_TRACE(c.className);
+    Siblings trade(c.className);
+    trade.WriteOrders(trade.Line("PARTNEREDIADDR=OTHERS"));
     const auto importer = trade.Start();
-    trade.WriteOrders(trade.Line());
-    // From the last to the first, so that each time all behind the missing one are missing, too.
-    std::istringstream words(c.fields);
-    const Texts expected{std::istream_iterator<std::string>(words), std::istream_iterator<std::string>()};
-    Texts found = expected;
     RowTable table;
-    while (!found.empty()) {
-      const std::string missing = found.back();
-      found.pop_back();
-      trade.folder.Write("orders.map", MapText(found) + "OTHER\r\nINTCONTROLNO\r\n");
-      if (missing == expected.front()) trade.folder.Write("orders.map", "OTHER");
+    const auto told = [&](const Texts& fields) {
+      trade.folder.Write("orders.map", MapText(fields) + "OTHER\r\nINTCONTROLNO\r\n");
       EXPECT_EQ(importer->Load(trade.OrdersPath(), table), 0);
-      EXPECT_EQ(trade.NewLog().back(),
-                "W OpenMapFile: Expected field " + missing + " not found. \r\n Add this item to your orders.map file.");
+      return trade.NewLog().back();
+    };
+    Texts expected(orders::kOrderFieldNames.begin(), orders::kOrderFieldNames.begin() + orders::kUsualOrderFields);
+    for (const std::string& field : words(c.removed)) EXPECT_EQ(std::erase(expected, field), 1U) << field;
+    std::ranges::copy(words(c.added), std::back_inserter(expected));
+    for (std::size_t field = 1; field < expected.size(); ++field) {
+      // All behind the missing one are missing, too.
+      EXPECT_EQ(told(Texts(expected.begin(), expected.begin() + std::ssize(expected) - std::ptrdiff_t(field))),
+                "W OpenMapFile: Expected field " + expected[expected.size() - field] +
+                    " not found. \r\n Add this item to your orders.map file.");
     }
-    trade.folder.Write("orders.map", MapText(trade.columns) + "PONUMBER");
-    EXPECT_EQ(importer->Load(trade.OrdersPath(), table), 1);
-    EXPECT_EQ(table.At(0, 0), Cell("450001"s));
-    EXPECT_EQ(trade.NewLog().size(), expected.size());
+    EXPECT_EQ(told(expected), "0 Load: No orders found to match EDI addresses.");
   }
 }
 
@@ -221,28 +171,25 @@ TEST(CsvListingTest, SignsItsLogRecords) {
 TEST(CsvListingTest, ListsNothingForADocumentThatIsNotThere) {
   CsvTrade trade(kMgb);
   const auto importer = trade.Create(kMgb);
+  importer->PROCESSALL = true;
   ColumnTable columns;
   EXPECT_TRUE(importer->Init(*trade.system, 99, columns));
+  EXPECT_FALSE(importer->PROCESSALL);
   RowTable table;
   EXPECT_EQ(importer->Load(trade.OrdersPath(), table), 0);
   EXPECT_THAT(trade.LogLines(), ElementsAre("53 OpenMapFile: PO map file  does not exist."));
 }
 
 TEST(CsvListingTest, AsksTheErrorTrailAboutAReadThatFails) {
-  const struct {
-    Button answer;
-    std::int32_t rows;
-  } cases[] = {{Button::kRetry, 2}, {Button::kAbort, 0}};
-  for (const auto& c : cases) {
+  for (const Button answer : {Button::kRetry, Button::kAbort}) {
     CsvTrade trade(kMgb);
-    FaultyFiles files(*trade.ports.files);
-    trade.ports.files = &files;
-    trade.answer = c.answer;
+    FaultyFiles& files = trade.UseFaultyFiles();
+    trade.answer = answer;
     trade.WriteOrders(trade.Line() + trade.Line("TRNCONTROLNO=34"));
     const auto importer = trade.Start();
     files.Fail("Read", "orders.txt", 57);
     RowTable table;
-    EXPECT_EQ(importer->Load(trade.OrdersPath(), table), c.rows);
+    EXPECT_EQ(importer->Load(trade.OrdersPath(), table), answer == Button::kRetry ? 2 : 0);
     EXPECT_THAT(trade.reports,
                 ElementsAre("TLE error - program error #57 (It failed: orders.txt) occured in module cMGB850csv, "
                             "Function SetOrderList, line 0."));
@@ -251,22 +198,33 @@ TEST(CsvListingTest, AsksTheErrorTrailAboutAReadThatFails) {
 }
 
 // A field that the line doesn't have stays, and so does one between two commas; a last field or a quoted one that is
-// empty is a value.
+// empty is a value. Only MGB's translator protects commas by quotes.
 TEST(CsvListingTest, SplitsALineOverTheCallersFields) {
   const struct {
     std::string line;
-    Texts fields;
+    Texts fields, mgbbt;
   } cases[] = {
-      {"a,,\"c\"", {"a", "2", "c"}}, {"a", {"a", "2", "3"}},       {"\"a,b\",c,d", {"\"a", "b\"", "c"}},
-      {"a,b,", {"a", "b", ""}},      {"\"\",b,\"", {"", "b", ""}},
+      {"a,,\"c\"", {"a", "2", "c"}, {"a", "2", "c"}},
+      {"a", {"a", "2", "3"}, {"a", "2", "3"}},
+      {"\"a,b\",c,d", {"\"a", "b\"", "c"}, {"a,b", "c", "d"}},
+      {"a,b,", {"a", "b", ""}, {"a", "b", ""}},
+      {"\"\",b,\"", {"", "b", ""}, {"", "b", ""}},
   };
-  CsvTrade trade(kMgb);
+  CsvTrade trade(kMgbbt);
   const orders::clsMGB850csv importer(trade.ports);
+  const orders::clsMGBBT850csv mgbbt(trade.ports);
   for (const auto& c : cases) {
-    Texts fields = {"1", "2", "3"};
+    Texts fields = {"1", "2", "3"}, protectedFields = fields;
     importer.SetFields(c.line, fields);
     EXPECT_EQ(fields, c.fields) << c.line;
+    mgbbt.SetFields(c.line, protectedFields);
+    EXPECT_EQ(protectedFields, c.mgbbt) << c.line;
   }
+  trade.Import(trade.Line("CUSTCAT=\"GIFTS, TOYS\"; BIN=\"B,1\"; CUSTOMERREF=\"R,E,F\""));
+  const auto stored = trade.StoredOrderRecords();
+  ASSERT_EQ(stored.size(), 1U);
+  EXPECT_EQ(stored[0]->CustCat, "GIFTS, TOYS");
+  EXPECT_EQ(stored[0]->CustomerRef, "R,E,F");
 }
 
 }  // namespace

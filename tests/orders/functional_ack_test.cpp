@@ -1,26 +1,14 @@
 #include "orders/functional_ack.h"
 
-#include "support/faulty_files.h"
-#include "support/trading_fixture.h"
+#include "support/order_trade.h"
 
 namespace partnerkit::orders {
 namespace {
 
+using partnerkit::testing::Replaced;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::UnorderedElementsAre;
-
-// The least that can acknowledge.
-class Reader : public TranslatorBase {
- public:
-  explicit Reader(const Ports& ports) : TranslatorBase("clsKMart850ansix12", ports) {}
-  bool Init(System& system, std::int16_t EDIDocId, ColumnTable&) override { return Bind(system, EDIDocId), true; }
-  std::int32_t Load(const std::string&, RowTable&) override { return 0; }
-  std::int32_t Process(std::int32_t, ErrorList&) override { return 0; }
-  bool Delete(std::int32_t, ErrorList&) override { return false; }
-  bool Term() override { return true; }
-  void Cancel() override {}
-};
 
 // A partner who gave numbers before, and a folder for acknowledgements.
 struct Acknowledging : partnerkit::testing::TradingHost {
@@ -41,11 +29,12 @@ struct Acknowledging : partnerkit::testing::TradingHost {
 
   bool Write(std::string_view className, std::string_view acknowledged, std::string_view prefix,
              std::string_view reference, int transactions) {
-    Reader reader(ports);
+    const auto reader = Create("clsKMart850ansix12");
     if (!Update(system->Records(), document)) Stored(document);
     ColumnTable columns;
-    reader.Init(*system, 1, columns);
-    return WriteFunctionalAck(reader, *X12EnvelopeOf(className, "997"), acknowledged, prefix, reference, transactions);
+    reader->Init(*system, 1, columns);
+    return WriteFunctionalAck(dynamic_cast<TranslatorBase&>(*reader), *X12EnvelopeOf(className, "997"), acknowledged,
+                              prefix, reference, transactions);
   }
   bool Write(std::string_view reference = "4711") { return Write("clsKMart850ansix12", "PO", "FA_PO_", reference, 3); }
 
@@ -66,7 +55,7 @@ struct Acknowledging : partnerkit::testing::TradingHost {
   EDIDoc document;
 };
 
-constexpr const char* kFirst =
+const std::string kFirst =
     "ISA*00*          *00*          *ZZ*ACMETOYS       *ZZ*KMARTSTORES01  *060308*1015*U*00204*000000471*0*P*>\r\n"
     "GS*FA*ACMETOYS*KMARTSTORES0*060308*1015*58*X*003020\r\n"
     "ST*997*0001\r\n"
@@ -76,50 +65,31 @@ constexpr const char* kFirst =
     "GE*1*58\r\n"
     "IEA*1*000000471\r\n";
 
-TEST(FunctionalAck, IsAWholeInterchange) {
+TEST(FunctionalAck, IsAWholeInterchangeBehindAnotherOfTheSameMinute) {
   Acknowledging trade;
   EXPECT_TRUE(trade.Write());
   EXPECT_TRUE(trade.Write("clsMGB850ansix12", "PO", "FA_RA_", "4712", 1));
   EXPECT_THAT(trade.Written(), UnorderedElementsAre("FA_PO_4711_0603081015.TXT", "FA_RA_4712_0603081015.TXT"));
   EXPECT_EQ(trade.folder.Read("ack/FA_PO_4711_0603081015.TXT"), kFirst);
+  EXPECT_TRUE(trade.Write("clsKMart850ansix12", "RA", "FA_PO_", "4711", 0));
+  std::string second = Replaced(Replaced(kFirst, "000000471", "000000473"), "*58", "*60");
+  second = Replaced(Replaced(second, "AK1*PO", "AK1*RA"), "*3*3*3", "*0*0*0");
+  EXPECT_EQ(trade.folder.Read("ack/FA_PO_4711_0603081015.TXT"), kFirst + second);
   EXPECT_THAT(trade.LogLines(), IsEmpty());
 }
 
-TEST(FunctionalAck, GoesBehindAnotherOfTheSameMinute) {
+TEST(FunctionalAck, DrawsNoNumbersWithoutAFile) {
   Acknowledging trade;
-  EXPECT_TRUE(trade.Write());
-  trade.document.TestMode = true;
-  EXPECT_TRUE(trade.Write("clsKMart820ansix12", "RA", "FA_PO_", "4711", 0));
-  EXPECT_EQ(trade.folder.Read("ack/FA_PO_4711_0603081015.TXT"),
-            std::string(kFirst) +
-                "ISA*00*          *00*          *ZZ*ACMETOYS       *ZZ*KMARTSTORES01  "
-                "*060308*1015*U*00204*000000472*0*T*>\r\n"
-                "GS*FA*ACMETOYS*KMARTSTORES0*060308*1015*59*X*003010\r\n"
-                "ST*997*0001\r\n"
-                "AK1*RA*4711\r\n"
-                "AK9*A*0*0*0\r\n"
-                "SE*4*0001\r\n"
-                "GE*1*59\r\n"
-                "IEA*1*000000472\r\n");
-}
-
-TEST(FunctionalAck, IsNotWrittenForAPartnerWithoutAFolderForIt) {
   for (const Text& none : {Text(), Text("")}) {
-    Acknowledging trade;
     trade.document.AckFolder = none;
     EXPECT_TRUE(trade.Write());
-    EXPECT_EQ(trade.Numbers(), "470/57");
     EXPECT_THAT(trade.LogLines(), IsEmpty());
   }
-}
-
-TEST(FunctionalAck, FailsWhenItsFileCannotBeOpened) {
-  Acknowledging trade;
   trade.document.AckFolder = trade.folder / "gone/";
   EXPECT_FALSE(trade.Write());
-  EXPECT_EQ(trade.Numbers(), "470/57");
   EXPECT_THAT(trade.LogLines(), ElementsAre("76 Open FA File: Cannot open FA file " + trade.folder / "gone/" +
                                             "FA_PO_4711_0603081015.TXT"));
+  EXPECT_EQ(trade.Numbers(), "470/57");
   EXPECT_THAT(trade.reports, IsEmpty());
 }
 

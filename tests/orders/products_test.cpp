@@ -8,43 +8,17 @@ namespace partnerkit::testing {
 namespace {
 
 using ::testing::ElementsAre;
+using ::testing::EndsWith;
 using ::testing::IsEmpty;
-
-constexpr const char* kMgb = "clsMGB850csv";
-
-using Texts = std::vector<std::string>;
+using ::testing::StartsWith;
 
 class ProductsTest : public ::testing::Test {
  protected:
-  static Product Train(const std::string& number) {
-    return With<Product>([&](Product& product) {
-      product.ProductNo = number;
-      product.PartnerId = "MYER";
-      product.InHouseProdNo = "TRAIN";
-      product.Colour = "RED";
-      product.Size = "XL";
-      product.Description = "Old train";
-      product.UOM = "DZ";
-      product.Symbology = "UP";
-      product.Weight = 9;
-      product.Volume = 8;
-      product.CartonAPN = "C7";
-    });
-  }
-  void StorePrice(const std::string& number) {
-    trade_.Stored(With<ProductPrice>([&](ProductPrice& price) {
-      price.VendorId = "ACME";
-      price.ProductNo = number;
-      price.Cost = 12.5;
-      price.ImportValue1 = "old";
-    }));
-  }
-  template <class R>
-  Texts All() {
-    Texts all;
-    R record;
-    trade_.system->Records().ForEach(R::kType, &record, [&] { all.push_back(Shown(record)); });
-    return all;
+  static void StoreTrain(CsvTrade& trade, const std::string& number) {
+    trade.Sql(
+        "INSERT INTO tbProduct (ProductNo, PartnerId, InHouseProdNo, Colour, Size, Description, UOM, Symbology, "
+        "Weight, Volume, CartonAPN) VALUES ('" +
+        number + "', 'MYER', 'TRAIN', 'RED', 'XL', 'Old train', 'DZ', 'UP', 9, 8, 'C7')");
   }
   // Lists an order file while the product file is there; what that tells.
   Texts Import(std::string_view products) {
@@ -52,8 +26,7 @@ class ProductsTest : public ::testing::Test {
     return Listed();
   }
   Texts Listed() {
-    const auto importer = trade_.Loaded(trade_.Line());
-    importer->Cancel();
+    EXPECT_EQ(trade_.Listed(trade_.Line()).size(), 1U);
     return trade_.NewLog();
   }
   bool FileIsThere() { return trade_.folder.Has("products.csv"); }
@@ -67,56 +40,51 @@ const std::string kTrain = "TRAIN,RED,XL,Train,,,93001,B2,,,w11,,,,,w16,w17,,,,,
 TEST_F(ProductsTest, FitsTheProductToTheOrderLine) {
   const std::string made =
       R"( PartnerId="MGB" InHouseProdNo="TRAIN" Colour="RED" Size="XL" Description="Wooden train" )";
-  const std::string completed = "0 Process: PO 450001 import completed.";
-  const std::string incomplete = "0 Process: PO 450001 import incomplete.";
   const std::string old = R"( PartnerId="MYER" InHouseProdNo="TRAIN" Colour="RED" Size="XL" Description="Old train" )"
                           R"(UOM="DZ" Symbology="UP" Weight=9 Volume=8 CartonAPN="C7")";
   const std::string usual =
       made + R"(UOM="CT" Symbology="EN" ProductClass="MEDIUM" Bin="B12" Weight=0.75 Volume=0.003)";
   const struct {
-    std::string what, className;
+    std::string what;
     Texts known;  // numbers the product is stored under
     std::string line;
     Texts products, log;
-    std::string trigger = {};
+    bool refuses = false;  // to delete a product
   } cases[] = {
       // clang-format off
-      {"new", kMgb, {}, "", {R"(ProductNo="93001")" + usual}, {completed}},
-      {"known", kMgb, {"93001"}, "", {R"(ProductNo="93001")" + usual + R"( CartonAPN="C7")"}, {completed}},
-      {"renumbered", kMgb, {"93000"}, "", {R"(ProductNo="93001")" + usual}, {completed}},
-      {"under no number", kMgb, {" "}, "", {R"(ProductNo=" ")" + old, R"(ProductNo="93001")" + usual}, {completed}},
-      {"no weight, no unit", kMgb, {}, "WEIGHT=0; UNITMEASURECODE=; VOLUME=; BIN=",
+      {"new", {}, "", {R"(ProductNo="93001")" + usual}, {kCompleted}},
+      {"known", {"93001"}, "", {R"(ProductNo="93001")" + usual + R"( CartonAPN="C7")"}, {kCompleted}},
+      {"renumbered", {"93000"}, "", {R"(ProductNo="93001")" + usual}, {kCompleted}},
+      {"under no number", {" "}, "", {R"(ProductNo=" ")" + old, R"(ProductNo="93001")" + usual}, {kCompleted}},
+      {"no weight, no unit", {}, "WEIGHT=0; UNITMEASURECODE=; VOLUME=; BIN=",
        {R"(ProductNo="93001")" + made + R"(UOM="EA" Symbology="EN" ProductClass="MEDIUM" Bin="" Weight=0.01)"},
-       {"R Process: ...Cannot process PO 450001, product 93001 UOM  does not agree with database UOM EA", incomplete}},
-      {"another symbology", kMgb, {}, "PRODUCTQUALIFIER=UP; WEIGHT=; COLOUR=; SIZE=",
+       {Refused("product 93001 UOM  does not agree with database UOM EA"), kIncomplete}},
+      {"another symbology", {}, "PRODUCTQUALIFIER=UP; WEIGHT=; COLOUR=; SIZE=",
        {R"(ProductNo="93001" PartnerId="MGB" InHouseProdNo="TRAIN" Colour="" Size="" Description="Wooden train" )"
         R"(UOM="CT" Symbology="EN" ProductClass="MEDIUM" Bin="B12" Weight=0.01 Volume=0.003)"},
-       {"R Process: ...Cannot process PO 450001, barcode 93001 symbology UP does not agree with database symbology EN",
-        incomplete}},
-      {"no style at all", kMgb, {}, "STYLE=; COLOUR=; SIZE=", {},
-       {"R Process: ...Cannot process PO 450001, product 93001 does not exist.", incomplete}},
-      {"the old number cannot go", kMgb, {"93000"}, "", {R"(ProductNo="93000")" + old},
-       {"R Process: ...Cannot process PO 450001, product 93001 does not exist.", incomplete},
-       "CREATE TRIGGER refuse BEFORE DELETE ON tbProduct BEGIN SELECT RAISE(ABORT, 'in use'); END"},
+       {Refused("barcode 93001 symbology UP does not agree with database symbology EN"),
+        kIncomplete}},
+      {"no style at all", {}, "STYLE=; COLOUR=; SIZE=", {},
+       {Refused("product 93001 does not exist."), kIncomplete}},
+      {"the old number cannot go", {"93000"}, "", {R"(ProductNo="93000")" + old},
+       {Refused("product 93001 does not exist."), kIncomplete},
+       true},
       // clang-format on
   };
   for (const auto& c : cases) {
     SCOPED_TRACE(c.what);
     for (const bool validate : {false, true}) {
-      CsvTrade trade(c.className);
+      CsvTrade trade(kMgb);
       trade.document.ValidateProduct = validate;
-      for (const std::string& number : c.known) trade.Stored(Train(number));
-      if (!c.trigger.empty()) trade.Sql(c.trigger);
+      for (const std::string& number : c.known) StoreTrain(trade, number);
+      if (c.refuses) trade.Refuse("DELETE", "tbProduct");
       const auto run = trade.Import(trade.Line(c.line));
-      Texts products;
-      Product product;
-      trade.system->Records().ForEach(Product::kType, &product, [&] { products.push_back(Shown(product)); });
       if (validate) {
-        EXPECT_EQ(products, c.products);
+        EXPECT_EQ(trade.Every<Product>(), c.products);
         EXPECT_EQ(run.log, c.log);
       } else {
-        EXPECT_EQ(products.size(), c.known.size());
-        EXPECT_THAT(run.log, ElementsAre(completed));
+        EXPECT_EQ(trade.Every<Product>().size(), c.known.size());
+        EXPECT_THAT(run.log, ElementsAre(kCompleted));
       }
       EXPECT_THAT(trade.reports, IsEmpty());
     }
@@ -124,39 +92,40 @@ TEST_F(ProductsTest, FitsTheProductToTheOrderLine) {
 }
 
 TEST_F(ProductsTest, ImportsTheProductFileAndDeletesIt) {
-  trade_.Stored(Train("93000"));
-  StorePrice("93000");
-  StorePrice("93010");
+  StoreTrain(trade_, "93000");
+  trade_.Sql(
+      "INSERT INTO tbProductPrice (VendorId, ProductNo, Cost, ImportValue1) "
+      "VALUES ('ACME', '93000', 12.5, 'old'), ('ACME', '93010', 12.5, 'old')");
   EXPECT_THAT(Import(kBall + "\n" + kTrain), IsEmpty());
   EXPECT_FALSE(FileIsThere());
   EXPECT_THAT(
-      All<Product>(),
+      trade_.Every<Product>(),
       ElementsAre(
           R"(ProductNo="93001" PartnerId="MGB" InHouseProdNo="TRAIN" Colour="RED" Size="XL" Description="Train" )"
           R"(UOM="EA" Symbology="EN" ProductClass="MEDIUM" Bin="B2" Weight=0.01)",
           R"(ProductNo="93010" PartnerId="MGB" InHouseProdNo="BALL" Colour="BLUE" Size="S" )"
           R"(Description="Ball, soft" UOM="EA" Symbology="EN" ProductClass="MEDIUM" Bin="B1" Weight=0.01)"));
   EXPECT_THAT(
-      All<ProductPrice>(),
+      trade_.Every<ProductPrice>(),
       ElementsAre(R"(VendorId="ACME" ProductNo="93001" ImportValue1="w11" ImportValue2="w16" ImportValue3="w17")",
                   R"(VendorId="ACME" ProductNo="93010" Cost=12.5 ImportValue1="v11" ImportValue2="v16" )"
                   R"(ImportValue3="v17")"));
 }
 
 TEST_F(ProductsTest, ResetsTheWeightOfAProductItKnows) {
-  trade_.Stored(Train("93001"));
+  StoreTrain(trade_, "93001");
   EXPECT_THAT(Import(kTrain), IsEmpty());
-  EXPECT_THAT(All<Product>(), ElementsAre(::testing::EndsWith(R"(Bin="B2" Weight=0.01 CartonAPN="C7")")));
+  EXPECT_THAT(trade_.Every<Product>(), ElementsAre(EndsWith(R"(Bin="B2" Weight=0.01 CartonAPN="C7")")));
 }
 
 TEST_F(ProductsTest, PassesOverARecordThatTheStoreRefuses) {
-  trade_.Stored(Train("93000"));
-  trade_.Sql("CREATE TRIGGER refuse BEFORE DELETE ON tbProduct BEGIN SELECT RAISE(ABORT, 'in use'); END");
+  StoreTrain(trade_, "93000");
+  trade_.Refuse("DELETE", "tbProduct");
   EXPECT_THAT(Import(kTrain + kBall), IsEmpty());
   EXPECT_FALSE(FileIsThere());
-  EXPECT_THAT(All<Product>(),
-              ElementsAre(::testing::StartsWith("ProductNo=\"93000\""), ::testing::StartsWith("ProductNo=\"93010\"")));
-  EXPECT_THAT(All<ProductPrice>(), ElementsAre(::testing::StartsWith("VendorId=\"ACME\" ProductNo=\"93010\"")));
+  EXPECT_THAT(trade_.Every<Product>(),
+              ElementsAre(StartsWith("ProductNo=\"93000\""), StartsWith("ProductNo=\"93010\"")));
+  EXPECT_THAT(trade_.Every<ProductPrice>(), ElementsAre(StartsWith("VendorId=\"ACME\" ProductNo=\"93010\"")));
 }
 
 // The run ends at the bad line, whatever the trail answers; what came before it is stored.
@@ -171,7 +140,7 @@ TEST_F(ProductsTest, KeepsAFileWithABadLine) {
                     ", line 2 has 2 columns instead of 22) occured in module cMGB850csv, Function ImportProduct, "
                     "line 0."));
     EXPECT_TRUE(FileIsThere());
-    EXPECT_THAT(All<Product>(), ElementsAre(::testing::StartsWith("ProductNo=\"93010\"")));
+    EXPECT_THAT(trade_.Every<Product>(), ElementsAre(StartsWith("ProductNo=\"93010\"")));
   }
 }
 
@@ -183,7 +152,7 @@ TEST_F(ProductsTest, ComesUpAgainWhenABadLineIsRetried) {
   Import("bad,line\n" + kTrain);
   EXPECT_EQ(asked, 3);
   EXPECT_TRUE(FileIsThere());
-  EXPECT_THAT(All<Product>(), IsEmpty());
+  EXPECT_THAT(trade_.Every<Product>(), IsEmpty());
 }
 
 TEST_F(ProductsTest, ListsOrdersWithoutAProductFile) {
@@ -195,7 +164,7 @@ TEST_F(ProductsTest, ListsOrdersWithoutAProductFile) {
   {
     const OtherProgram other(trade_.folder / "products.csv");
     EXPECT_THAT(Listed(), IsEmpty());
-    EXPECT_THAT(All<Product>(), IsEmpty());
+    EXPECT_THAT(trade_.Every<Product>(), IsEmpty());
   }
   EXPECT_TRUE(FileIsThere());
   EXPECT_THAT(trade_.reports, IsEmpty());

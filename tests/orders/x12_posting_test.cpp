@@ -10,10 +10,6 @@ namespace {
 using ::testing::IsEmpty;
 using ::testing::SizeIs;
 
-using Texts = std::vector<std::string>;
-
-const std::string kCompleted = "0 Process: PO 450001 import completed.";
-const std::string kIncomplete = "0 Process: PO 450001 import incomplete.";
 const std::string kBegin = "BEG*00*SA*450001**060301~";
 
 TEST(X12PostingTest, StoresEveryMemberOfAnOrder) {
@@ -138,21 +134,20 @@ Texts Given(X12Trade& trade) {
 }
 
 TEST(X12PostingTest, GivesEachLineToItsStores) {
-  const std::string noShipTo = "R Process: ...Cannot process PO 450001, ship to location ";
-  const std::string noBuying = "R Process: ...Cannot process PO 450001, buying location ";
-  const std::string noStore = "R Process: ...Cannot process PO 450001, store location ";
+  const std::string noShipTo = Refused("ship to location 0888 does not exist.");
+  const std::string noBuying = Refused("buying location 0888 does not exist.");
+  const std::string noStore = Refused("store location 0888 does not exist.");
   const std::string store = "SDQ*EA*92*0512*18~", n1 = "N1*ST*X*92*0900~", direct = "N1*ST*X*92*DTS~";
   std::string ten = "SDQ*EA*92";
   for (int n = 0; n < 11; ++n) ten += "*S" + std::to_string(n) + "*" + std::to_string(n + 1);
   const Texts toEach = {"0512>0512 93001 18"}, toDirect = {"DTS>0512 93001 18"}, toAll = {">0512 93001 18"};
   const struct {
-    Names classes;
+    Texts classes;
     std::string n1;
     Texts lines;  // what follows each PO1
     Texts log, given;
   } cases[] = {
       // clang-format off
-      {kAllClasses, n1, {store}, {}, {"0900>0512 93001 18"}},
       {kAllClasses, n1, {"", store}, {}, {"0900>0900 93001 24", "0900>0512 93002 18"}},
       {kAllClasses, n1, {store + "SDQ*EA*92*0513*6.5*0514*0~", ""}, {},
        {"0900>0512 93001 18", "0900>0513 93001 6.5", "0900>0514 93001 0", "0900>0900 93002 24"}},
@@ -161,18 +156,15 @@ TEST(X12PostingTest, GivesEachLineToItsStores) {
       {{kTarget}, "", {store}, {}, toAll},
       {{kTarget}, direct, {store}, {}, toEach},
       {{kTarget}, direct, {""}, {}, {"DTS>DTS 93001 24"}},
-      {{kMgb, kGhpl, kKmart}, direct, {store}, {noShipTo + "DTS does not exist."}, {}},
-      {kAllClasses, "N1*ST*X*92*0999~N1*BY*X*92*0900~", {store}, {noShipTo + "0999 does not exist."}, {}},
-      {{kMgb, kTarget, kGhpl}, n1, {"SDQ*EA*92*0888*1*0888*1~"},
-       {noBuying + "0888 does not exist.", "0 Process: Duplicate lines found for store 0888 EAN 93001"}, {}},
-      {{kMgb, kTarget, kGhpl}, n1, {"SDQ*EA*92*0888*1*0512*1~", "SDQ*EA*92*0888*1~"},
-       {noBuying + "0888 does not exist.", noBuying + "0888 does not exist."}, {}},
-      {{kKmart}, n1, {"SDQ*EA*92*0888*1~"}, {noStore + "0888 does not exist."}, {}},
-      {{kMgb, kGhpl}, "", {"SDQ*EA*92*0888*1~"}, {noShipTo + "0888 does not exist."}, {}},
-      {{kKmart}, "", {"SDQ*EA*92*0888*1~"},
-       {noShipTo + "0888 does not exist.", noStore + "0888 does not exist."},
+      {{kMgb, kGhpl, kKmart}, direct, {store}, {Refused("ship to location DTS does not exist.")}, {}},
+      {kAllClasses, "N1*ST*X*92*0999~N1*BY*X*92*0900~", {store}, {Refused("ship to location 0999 does not exist.")},
        {}},
-      {kAllClasses, n1, {store + store}, {"0 Process: Duplicate lines found for store 0512 EAN 93001"}, {}},
+      {{kMgb, kTarget, kGhpl}, n1, {"SDQ*EA*92*0888*1*0888*1~"},
+       {noBuying, "0 Process: Duplicate lines found for store 0888 EAN 93001"}, {}},
+      {{kMgb, kTarget, kGhpl}, n1, {"SDQ*EA*92*0888*1*0512*1~", "SDQ*EA*92*0888*1~"}, {noBuying, noBuying}, {}},
+      {{kKmart}, n1, {"SDQ*EA*92*0888*1~"}, {noStore}, {}},
+      {{kMgb, kGhpl}, "", {"SDQ*EA*92*0888*1~"}, {noShipTo}, {}},
+      {{kKmart}, "", {"SDQ*EA*92*0888*1~"}, {noShipTo, noStore}, {}},
       {kAllClasses, n1, {"SDQ*EA*92*0900*1~", "SDQ*EA*92*0900*1*0900*2~"},
        {"0 Process: Duplicate lines found for store 0900 EAN 93002"}, {}},
       {{kMgb, kGhpl, kKmart}, "", {ten + "~"}, {},
@@ -245,12 +237,7 @@ TEST(X12PostingTest, HandsAPostedOrderOn) {
       return progId == "Acme.Out" ? std::make_unique<Recorder>(told, c.agrees) : nullptr;
     };
     trade.document.Options = c.options;
-    trade.Stored(With<EDIDoc>([&](EDIDoc& out) {
-      out.EDIDocId = 3;
-      out.PartnerId = c.partner;
-      out.VendorId = "ACME";
-      out.ProgId = c.progId;
-    }));
+    trade.AddDocument(c.partner, "", c.progId);
     trade.Stored(With<Log>([](Log& log) { log.Procedure = "Process", log.Message = "PO 450001 import completed."; }));
     const auto run = trade.Import(trade.Sent(trade.File(trade.Body())));
     EXPECT_EQ(told, c.calls);

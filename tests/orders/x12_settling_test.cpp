@@ -1,7 +1,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "support/faulty_files.h"
+#include <regex>
+
 #include "support/x12_orders.h"
 
 namespace partnerkit::testing {
@@ -10,8 +11,6 @@ namespace {
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::SizeIs;
-
-using Texts = std::vector<std::string>;
 
 // What isn't ours and stays byte for byte: "{F}" an interchange, "{G}" a group within ours, "{O}" outside of them all.
 std::string WithOthers(std::string text) {
@@ -69,8 +68,6 @@ TEST(X12SettlingTest, LeavesInTheFileWhatIsNotDealtWith) {
         {"all", Interchange(Group(failing)), 1, Interchange(Marked(failing)), Interchange(Marked(failing))},
         {"one", Interchange(Group(good + failing)), 2, Interchange(Marked(kPair + failing)),
          Interchange(Marked(failing))},
-        {"its neighbour", Interchange(Group(failing + good)), 2, Interchange(Marked(failing + kPair)),
-         Interchange(Marked(failing))},
         {"empty pairs", Interchange(Group(kPair + failing + "ST*850*0004~SE*1~", "77")), 1,
          Interchange(Marked(failing)), Interchange(Marked(failing))},
         {"a group", Interchange(Group(good) + Group("", "76") + Group(failing, "78")), 2,
@@ -127,8 +124,7 @@ TEST(X12SettlingTest, TakesAFinishedFileAway) {
     EXPECT_THAT(trade.Acks(), ElementsAre("FA_PO_77_0603081015.TXT AK1*PO*77 AK9*A*2*2*2"));
     EXPECT_THAT(trade.StoredOrders(), ElementsAre("450001/0", "450002/0"));
     // The same file sent again is turned away.
-    EXPECT_THAT(trade.Import(orders).log, ElementsAre("R Process: Cannot process. PO 450001 already exists.",
-                                                      "R Process: Cannot process. PO 450002 already exists."));
+    EXPECT_THAT(trade.Import(orders).log, ElementsAre(kExists, "R Process: Cannot process. PO 450002 already exists."));
     EXPECT_FALSE(trade.folder.Has(X12Trade::kFile));
     EXPECT_THAT(trade.reports, IsEmpty());
   }
@@ -203,8 +199,6 @@ TEST(X12SettlingTest, LosesNothingWhenSettlingFails) {
       // clang-format off
       {"Rename",     "orders.txt", Button::kAbort,  false, true,  0, true,  true},
       {"Delete",     "orders.txt", Button::kAbort,  true,  true,  0, true,  true},
-      {"OpenOutput", "orders.tmp", Button::kAbort,  false, false, 1, true,  false},
-      {"Write",      "orders.tmp", Button::kAbort,  false, false, 1, true,  false},
       {"Write",      "orders.tmp", Button::kIgnore, false, false, 1, true,  false},
       {"Write",      "orders.tmp", Button::kRetry,  false, true,  1, false, false},
       {"Sync",       "orders.tmp", Button::kAbort,  true,  false, 1, true,  false},
@@ -216,8 +210,7 @@ TEST(X12SettlingTest, LosesNothingWhenSettlingFails) {
   for (const auto& c : cases) {
     SCOPED_TRACE(c.operation + " " + c.file);
     Settling trade(kMgb);
-    FaultyFiles files(*trade.ports.files);
-    trade.ports.files = &files;
+    FaultyFiles& files = trade.UseFaultyFiles();
     trade.answer = c.answer;
     const std::string orders = Interchange(Group(trade.Good() + trade.Failing()));
     if (c.allPosted) trade.AddLocation("0999");
@@ -263,15 +256,8 @@ TEST(X12SettlingTest, PostsOnceWhateverTheFilesEnd) {
                    Interchange(Group(TransactionSet(trade.Body("450004") + trade.Line("93002"), "0004"), "78"), "2"));
     // Without ids and positions, which differ from run to run.
     const auto stored = [&] {
-      Texts records;
-      for (const std::string& record : trade.StoredRecords()) {
-        records.emplace_back();
-        std::istringstream words(record);
-        for (std::string word; words >> word;) {
-          const bool differs = word.starts_with("FilePos=") || (word.find("Id=") < word.size() && word.back() != '"');
-          if (!differs) records.back() += word + " ";
-        }
-      }
+      Texts records = trade.StoredRecords();
+      for (std::string& record : records) record = std::regex_replace(record, std::regex("\\w*(Id|FilePos)=\\d+"), "");
       return records;
     };
     const auto clear = [&] {

@@ -1,15 +1,39 @@
 // An importer's whole run over an order file, whatever its syntax, and what it stored.
 #pragma once
 
+#include <functional>
 #include <string>
 #include <string_view>
 #include <utility>
 #include <vector>
 
 #include "host/sql_session.h"
+#include "support/faulty_files.h"
 #include "support/trading_fixture.h"
 
 namespace partnerkit::testing {
+
+using Texts = std::vector<std::string>;
+
+// What is told of the usual order.
+inline const std::string kCompleted = "0 Process: PO 450001 import completed.";
+inline const std::string kIncomplete = "0 Process: PO 450001 import incomplete.";
+inline const std::string kExists = "R Process: Cannot process. PO 450001 already exists.";
+inline const std::string kScrapped = "W Process: ... Warning incomplete/scrapped PO 450001.";
+inline const std::string kWithErrors =
+    "0 Process: PO 450001 import completed with errors. Data maintenance or POA required.";
+inline std::string Refused(std::string_view why) {
+  return "R Process: ...Cannot process PO 450001, " + std::string(why);
+}
+inline std::string InError(std::string_view why) { return "R Process: ...PO 450001 in error, " + std::string(why); }
+
+inline std::string Replaced(std::string_view text, std::string_view what, std::string_view by) {
+  std::string all;
+  for (std::size_t at; (at = text.find(what)) != std::string_view::npos; text.remove_prefix(at + what.size())) {
+    all.append(text.substr(0, at)).append(by);
+  }
+  return all.append(text);
+}
 
 // A member as text: quoted when it is text, absent when it is null, and left out when it is the number 0 or False.
 inline std::string Shown(const Member& member, void* record) {
@@ -70,13 +94,13 @@ inline void Set(EDIDoc& document, int validate) {
 }
 
 // The rows of the grid, the first three cells of each with a blank between; the last one is empty.
-inline std::vector<std::string> Rows(const RowTable& table) {
+inline Texts Rows(const RowTable& table) {
   const auto text = [](const Cell& cell) -> std::string {
     if (const auto* given = std::get_if<std::string>(&cell)) return *given;
     if (const auto* date = std::get_if<DateTime>(&cell)) return date->Iso();
     return std::holds_alternative<std::monostate>(cell) ? "empty" : "?";
   };
-  std::vector<std::string> rows;
+  Texts rows;
   for (std::size_t row = 0; row < table.Rows(); ++row) {
     EXPECT_EQ(table.Columns(), 4U);
     EXPECT_EQ(table.At(row, 3), Cell(std::string()));
@@ -109,10 +133,38 @@ class OrderTrade : public TradingHost {
   std::string OrdersPath() const { return folder / kFile; }
 
   void AddLocation(const std::string& number) {
-    Stored(With<PartnerLocn>([&](PartnerLocn& location) {
-      location.VendorId = "ACME";
-      location.PartnerLocnNo = number;
+    Sql("INSERT INTO tbPartnerLocn (VendorId, PartnerLocnNo) VALUES ('ACME', '" + number + "')");
+  }
+  // The product of the usual line, at its price, and one of another partner.
+  void AddUsualProducts() {
+    Sql("INSERT INTO tbProduct (ProductNo, PartnerId, InHouseProdNo, UOM, Symbology) "
+        "VALUES ('93001', 'MGB', 'TRAIN', 'CT', 'EN'), ('93005', 'MYER', NULL, 'CT', 'EN')");
+    Sql("INSERT INTO tbProductPrice (VendorId, ProductNo, SKU, Cost, Retail, TaxRate) "
+        "VALUES ('ACME', '93001', '555001', 12.5, 29.95, '10')");
+  }
+  // A further document definition with the partner.
+  void AddDocument(const std::string& partner, const std::string& code, const std::string& progId = "") {
+    Sql("INSERT INTO tbEDIDoc (EDIDocId, VendorId, PartnerId, DocumentCode, ProgId) VALUES (3, 'ACME', '" + partner +
+        "', '" + code + "', '" + progId + "')");
+  }
+  // An order of the usual number is in the store, with packing jobs made from it.
+  void AddOrder(int jobs, const std::function<void(Order&)>& set) {
+    const Order old = Stored(With<Order>([&](Order& order) {
+      order.VendorId = "ACME";
+      order.PartnerId = "MGB";
+      order.PONo = "450001";
+      order.TransactionCtl = "33";
+      set(order);
     }));
+    for (int job = 0; job < jobs; ++job) Stored(With<Job>([&](Job& made) { made.OrderId = old.OrderId; }));
+  }
+  // Every operation of that kind on the table fails, until "DROP TRIGGER refuse".
+  void Refuse(const std::string& operation, const std::string& table) {
+    Sql("CREATE TRIGGER refuse BEFORE " + operation + " ON " + table + " BEGIN SELECT RAISE(ABORT, 'refused'); END");
+  }
+  FaultyFiles& UseFaultyFiles() {
+    ports.files = &faulty_;
+    return faulty_;
   }
   void Sql(const std::string& statement) { system->Session().Execute(statement); }
 
@@ -133,13 +185,23 @@ class OrderTrade : public TradingHost {
     EXPECT_EQ(importer->Load(OrdersPath(), table), rows);
     return importer;
   }
+  // The rows that an importer lists of such a file, before it is cancelled.
+  Texts Listed(std::string_view orders) {
+    WriteOrders(orders);
+    const auto importer = Start();
+    RowTable table;
+    const std::int32_t rows = importer->Load(OrdersPath(), table);
+    EXPECT_EQ(static_cast<std::size_t>(rows), table.Rows());
+    importer->Cancel();
+    return Rows(table);
+  }
   // What the log got since the last `Start`.
-  std::vector<std::string> NewLog() { return LogLines(started_); }
+  Texts NewLog() { return LogLines(started_); }
 
   // One call of `Process`: its result, and what its error list names.
   struct Outcome {
     std::int32_t result = 0;
-    std::vector<std::string> told;
+    Texts told;
   };
   Outcome Process(Translator& importer, std::int32_t row) {
     ErrorList ids;
@@ -155,7 +217,7 @@ class OrderTrade : public TradingHost {
     std::int32_t rows = 0;
     std::vector<Outcome> outcomes;  // a row each
     bool term = false;
-    std::vector<std::string> log;
+    Texts log;
   };
   // Init, Load, Process of every row, Term.
   Run Import() {
@@ -173,6 +235,14 @@ class OrderTrade : public TradingHost {
     return Import();
   }
 
+  // All records of a kind.
+  template <class R>
+  Texts Every() {
+    Texts all;
+    R record;
+    system->Records().ForEach(R::kType, &record, [&] { all.push_back(Shown(record)); });
+    return all;
+  }
   std::vector<std::shared_ptr<Order>> StoredOrderRecords() {
     return All(Order::kByVendorAndPartner, With<Order>([](Order& probe) {
                  probe.VendorId = "ACME";
@@ -180,8 +250,8 @@ class OrderTrade : public TradingHost {
                }));
   }
   // Every stored order, each with its lines, locations and location lines.
-  std::vector<std::string> StoredRecords() {
-    std::vector<std::string> all;
+  Texts StoredRecords() {
+    Texts all;
     for (const auto& order : StoredOrderRecords()) {
       all.push_back(Shown(*order));
       AppendOf<OrderLine>(order->OrderId, all);
@@ -191,8 +261,8 @@ class OrderTrade : public TradingHost {
     return all;
   }
   // The number and status of each stored order: "450001/0".
-  std::vector<std::string> StoredOrders() {
-    std::vector<std::string> all;
+  Texts StoredOrders() {
+    Texts all;
     for (const auto& order : StoredOrderRecords()) all.push_back(order->PONo + "/" + std::to_string(order->Status));
     return all;
   }
@@ -206,12 +276,13 @@ class OrderTrade : public TradingHost {
 
  private:
   template <class R>
-  void AppendOf(std::int32_t orderId, std::vector<std::string>& all) {
+  void AppendOf(std::int32_t orderId, Texts& all) {
     const auto ofOrder = With<R>([&](R& probe) { probe.OrderId = orderId; });
     for (const auto& record : All(R::kByOrder, ofOrder)) all.push_back(Shown(*record));
   }
 
   std::int32_t started_ = 0;
+  FaultyFiles faulty_{*ports.files};
 };
 
 }  // namespace partnerkit::testing

@@ -15,8 +15,7 @@ inline constexpr const char* kTarget = "clsTarget850ansix12";
 inline constexpr const char* kGhpl = "clsGHPL850ansix12";
 inline constexpr const char* kKmart = "clsKMart850ansix12";
 
-using Names = std::vector<std::string>;
-inline const Names kAllClasses = {kMgb, kTarget, kGhpl, kKmart};
+inline const Texts kAllClasses = {kMgb, kTarget, kGhpl, kKmart};
 
 inline constexpr std::string_view kPartnerAddress = "MGBSTORES0123", kCompanyAddress = "ACMETOYS04567";
 
@@ -42,14 +41,6 @@ inline std::string TransactionSet(std::string_view segments, std::string_view co
                                   std::string_view set = "850") {
   return "ST*" + std::string(set) + "*" + std::string(control) + "~" + std::string(segments) + "SE*9*" +
          std::string(control) + "~";
-}
-
-inline std::string Replaced(std::string_view text, std::string_view what, std::string_view by) {
-  std::string all;
-  for (std::size_t at; (at = text.find(what)) != std::string_view::npos; text.remove_prefix(at + what.size())) {
-    all.append(text.substr(0, at)).append(by);
-  }
-  return all.append(text);
 }
 
 // A supplier of X12 orders who acknowledges them into "ack".
@@ -89,8 +80,8 @@ struct X12Trade : OrderTrade {
     std::filesystem::create_directory(folder / "ack");
   }
   // The acknowledgements, by name: "FA_PO_77_0603081015.TXT AK1*PO*77 AK9*A*1*1*1".
-  std::vector<std::string> Acks() const {
-    std::vector<std::string> acks;
+  Texts Acks() const {
+    Texts acks;
     for (const auto& entry : std::filesystem::directory_iterator(folder / "ack")) {
       acks.push_back(entry.path().filename());
       std::ifstream file(entry.path());
