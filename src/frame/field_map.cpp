@@ -47,11 +47,9 @@ bool FindColumn(const MapHeader& header, MapField& field) {
   return true;
 }
 
-void AppendOutboundLine(const MapHeader& header, FieldMap& fields, std::string& line) {
-  for (const std::string& column : header) {
-    if (const MapField* const field = fields.Find(column)) line += TrimBlanks(field->FieldValue);
-    line += ',';
-  }
+void AppendColumn(const MapField* field, std::string& line) {
+  if (field != nullptr) line += TrimBlanks(field->FieldValue);
+  line += ',';
 }
 
 }  // namespace partnerkit

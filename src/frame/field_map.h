@@ -49,8 +49,8 @@ MapHeader ReadMapHeader(InputFile& file);
 // Sets `field.FieldIndex` to the first entry of the header that is its name. False when there is none.
 bool FindColumn(const MapHeader& header, MapField& field);
 
-// An outbound line without its line end: the value of each column of the header, blanks cut, each followed by a comma,
-// the last too. Nothing is quoted or escaped. A column that the map doesn't know stays empty.
-void AppendOutboundLine(const MapHeader& header, FieldMap& fields, std::string& line);
+// A column of an outbound line: the field's value, blanks cut, and a comma, behind the last column too. Nothing is
+// quoted or escaped, so that a comma in a value splits its column. A column that the map doesn't know (null) is empty.
+void AppendColumn(const MapField* field, std::string& line);
 
 }  // namespace partnerkit

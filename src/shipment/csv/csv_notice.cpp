@@ -206,13 +206,9 @@ void CsvNotice::WriteRun(Notice& notice, std::int32_t quantity) {
   WriteLine(notice);
 }
 
-// Nothing is quoted or escaped: a comma in a value splits its column.
 void CsvNotice::WriteLine(Notice& notice) {
   const auto append = [&](std::string& text, std::size_t from, std::size_t to) {
-    for (std::size_t n = from; n < to; ++n) {
-      if (columns_[n] != nullptr) text += TrimBlanks(columns_[n]->FieldValue);
-      text += ',';
-    }
+    for (std::size_t n = from; n < to; ++n) AppendColumn(columns_[n], text);
   };
   if (leadingText_.empty()) append(leadingText_, 0, leading_);
   std::string& text = notice.files.Text(notice.output);
