@@ -23,7 +23,7 @@ TEST_F(Printers, AreListedWithTheirState) {
   std::vector<nlohmann::json> listed;
   const nlohmann::json told = Json({"printers"}, 1)["printers"];
   for (const auto& printer : told) {
-    EXPECT_EQ(printer["reachable"], printer["trouble"] == "");
+    EXPECT_EQ(printer["reachable"], printer["trouble"].get<std::string>().empty());
     listed.push_back({printer["Name"], printer["Kind"], printer["Target"], printer["trouble"], printer["jobs"]});
   }
   const std::string gone = "Path not found: " + folder / "gone" + ": No such file or directory";

@@ -67,12 +67,14 @@ TEST_F(ErrorTrailTest, ShowsTheReportAndGivesTheUsersAnswerUnlessSilent) {
 
 TEST_F(ErrorTrailTest, NamesTheComponentThatAnErrorCameFrom) {
   const std::string before = "TLE error - program error #5 (Odd) occured in module cMGB850csv, Function Load, line 0";
-  const std::string remote = ". This error was generated remotely by ", of = ", a component of /opt/lib/pk.so.";
+  const auto remote = [](const std::string& component) {
+    return ". This error was generated remotely by " + component + ", a component of /opt/lib/pk.so.";
+  };
   for (const auto& [source, suffix] : std::vector<std::pair<std::string, std::string>>{
            {"", "."},
            {"0/opt/lib/other.so!a!b", "."},
-           {"2/a.so!cA!Sub A!0!53!/b.so!cB!Sub B!0!53", remote + "/a.so" + of},
-           {"1!Carrier.Client!Book", remote + "Carrier.Client" + of},
+           {"2/a.so!cA!Sub A!0!53!/b.so!cB!Sub B!0!53", remote("/a.so")},
+           {"1!Carrier.Client!Book", remote("Carrier.Client")},
            {"7 without a mark", ""},
            {"1E999!a!b", ""},
        }) {

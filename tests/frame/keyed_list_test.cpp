@@ -31,7 +31,7 @@ TEST(KeyedList, FindsByPositionByKeyedTextAndByKey) {
   EXPECT_EQ(*list.Item("ID=a"), 'a');
   EXPECT_EQ(*list.Item("ID=ID=a"), '=');
   EXPECT_EQ(*list.Find("ID=a"), '=');
-  for (const std::size_t position : {0, 4}) EXPECT_FALSE(list.Item(position));
+  for (const std::size_t position : {std::size_t{0}, std::size_t{4}}) EXPECT_FALSE(list.Item(position));
   for (const char* text : {"ID=c", "b", ""}) EXPECT_FALSE(list.Item(text)) << text;
   EXPECT_FALSE(list.Find("A"));
   EXPECT_EQ(testing::ErrorOf([&] { Add(list, "a"); }),

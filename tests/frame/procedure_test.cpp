@@ -45,7 +45,8 @@ TEST_F(ProcedureTest, DoesAsTheUserAnswers) {
   const auto held = std::make_shared<int>();
   EXPECT_EQ(Guarded(errors, "Function Load", 1,
                     [&](int& result) {
-                      const auto alsoHeld = held;
+                      std::shared_ptr<int> alsoHeld;
+                      alsoHeld = held;
                       EXPECT_TRUE(Attempt(errors, Failing(2)));
                       EXPECT_EQ(runs_, 3);
                       {

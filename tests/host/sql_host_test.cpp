@@ -20,7 +20,7 @@ class SqlHostTest : public StoreTest {
   }
   // An order with two lines, a location and three location lines.
   Order AddOrder(const std::string& number) {
-    const auto order = Added<Order>([&](Order& o) { o.PONo = number; });
+    auto order = Added<Order>([&](Order& o) { o.PONo = number; });
     const auto of = [&](auto& record) { record.OrderId = order.OrderId; };
     Added<OrderLine>(of);
     Added<OrderLine>([&](OrderLine& line) { of(line), line.LineNo = "2"; });

@@ -11,9 +11,9 @@ Strings Lines(const Strings& jobs) {
   static const std::regex kLine(
       R"re((\{F,9,.*C,580,150,0,3,2,2,B,L,0,3,|\|26,)"([^"]*)".*(\|27|B,L,0,3),"([^"]*)".*\r\n)re");
   Strings lines;
-  const std::sregex_iterator found(jobs[0].begin(), jobs[0].end(), kLine);
-  for (const std::smatch& line : std::ranges::subrange(found, std::sregex_iterator())) {
-    lines.push_back((line[1] == "|26," ? "" : "- ") + line.str(2) + "/" + line.str(4));
+  for (std::sregex_iterator line(jobs[0].begin(), jobs[0].end(), kLine), none; line != none; ++line) {
+    lines.push_back(line->str(1) == "|26," ? "" : "- ");
+    lines.back().append(line->str(2)).append("/").append(line->str(4));
   }
   return lines;
 }

@@ -302,10 +302,14 @@ TEST(CsvSettlingTest, DeleteKeepsEnvelopeSegments) {
     const std::string kept = Joined(Written(trade, segments), "0123456789");
     const std::string gone = Joined(Written(trade, others), "01234");
     const std::string front = "ISA*11\r\nBEG*11\r\n", last = trade.Line("TRNCONTROLNO=34; PONUMBER=450002");
-    const auto importer = trade.Loaded(front + trade.Line() + kept + gone + last, 2);
+    std::string orders = front;
+    for (const std::string& part : {trade.Line(), kept, gone, last}) orders += part;
+    const auto importer = trade.Loaded(orders, 2);
     ErrorList list;
     EXPECT_TRUE(importer->Delete(0, list));
-    EXPECT_EQ(trade.Orders(), front + (className == kMyer || className == kMgb ? "" : kept) + last);
+    std::string left = front;
+    if (className != kMyer && className != kMgb) left += kept;
+    EXPECT_EQ(trade.Orders(), left += last);
     EXPECT_THAT(trade.NewLog(), ElementsAre("0 Delete: Transaction deleted from file."));
   }
 }
@@ -315,7 +319,8 @@ TEST(CsvSettlingTest, DeletesAnEmptyFileOnItsDirective) {
   for (const std::string& options : {exact, within, std::string("#%deleteonempty"), std::string()}) {
     for (const std::string className : kAllClasses) {
       for (const bool byDelete : {false, true}) {
-        SCOPED_TRACE(className + " " + options);
+        SCOPED_TRACE(className);
+        SCOPED_TRACE(options);
         Siblings trade(className);
         trade.document.Options = options;
         const auto importer = trade.Loaded(trade.Line(kTraded));

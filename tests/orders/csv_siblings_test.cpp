@@ -77,11 +77,11 @@ TEST(CsvSiblingsTest, StoresEveryMemberOfAnOrder) {
         kLocn, kLocn2,
         R"(LocnId=3 OrderId=1 VendorId="ACME" BuyingLocn="0514" ShipToLocn="0514" )" + kCustomer,
         kLocnLine,
-        R"(Id=2 OrderId=1 LineId=1 LocnId=2 ProductNo="93001" BuyingLocn="0513" LineRef="32" Quantity=6.5 )"
-        R"(AllocateQty=6.5)",
+        R"(Id=2 OrderId=1 LineId=1 LocnId=2 ProductNo="93001" BuyingLocn="0513" LineRef="32" Quantity=6.5 )" +
+        std::string("AllocateQty=6.5"),
         R"(Id=3 OrderId=1 LineId=2 LocnId=3 ProductNo="93002" BuyingLocn="0514" LineRef="31" Quantity=1e+11)",
-        R"(Id=4 OrderId=1 LineId=2 LocnId=1 ProductNo="93002" BuyingLocn="0512" LineRef="31" Quantity=1 )"
-        R"(AllocateQty=18)"}},
+        R"(Id=4 OrderId=1 LineId=2 LocnId=1 ProductNo="93002" BuyingLocn="0512" LineRef="31" Quantity=1 )" +
+        std::string("AllocateQty=18")}},
       {kMyer, {""},
        {kOrder + kDates + R"(DeptNo="042" SupplierNo="77001" CustomerRef="REF8" CustCat="GIFTS" )" + kControls,
         kUsualLine, kLocn, kLocnLine}},
@@ -91,10 +91,10 @@ TEST(CsvSiblingsTest, StoresEveryMemberOfAnOrder) {
         R"(LineId=1 OrderId=1 LineNo="1" ProductNo="93001" SKU="555001" Quantity=26 )" + kPriced + " RetailPrice=29.95",
         R"(LineId=2 OrderId=1 LineNo="2" ProductNo="93002" SKU="555001" Quantity=24 )" + kPriced + " RetailPrice=29.95",
         kLocn, kLocn2, kLocnLine,
-        R"(Id=2 OrderId=1 LineId=2 LocnId=1 ProductNo="93002" BuyingLocn="0512" LineRef="31" Quantity=24 )"
-        R"(AllocateQty=18)",
-        R"(Id=3 OrderId=1 LineId=1 LocnId=2 ProductNo="93001" BuyingLocn="0513" LineRef="31" Quantity=2 )"
-        R"(AllocateQty=18)"}},
+        R"(Id=2 OrderId=1 LineId=2 LocnId=1 ProductNo="93002" BuyingLocn="0512" LineRef="31" Quantity=24 )" +
+        std::string("AllocateQty=18"),
+        R"(Id=3 OrderId=1 LineId=1 LocnId=2 ProductNo="93001" BuyingLocn="0513" LineRef="31" Quantity=2 )" +
+        std::string("AllocateQty=18")}},
       {kTarget, {""},
        {kOrder + kDates + R"(Header1="20060401" Header2="NSW" Header3="PROMO" CustomerRef="REF8" )" + kControls,
         kUsualLine + R"( PackUOM="IN" PackSize="6")", kLocn, kLocnLine}},
@@ -165,8 +165,8 @@ TEST(CsvSiblingsTest, StoresEveryMemberOfAnOrder) {
         R"( PackUOM="CT" PackCount="12")",
         R"(LineId=2 OrderId=1 LineNo="8" ProductNo="93002" Quantity=24 PriceCode="LE" Cost=13.75)", kLocn,
         kAtLocn + R"(LineRef="31" Quantity=36 AllocateQty=36)",
-        R"(Id=2 OrderId=1 LineId=2 LocnId=1 ProductNo="93002" BuyingLocn="0512" LineRef="31" Quantity=24 )"
-        R"(AllocateQty=18)"}},
+        R"(Id=2 OrderId=1 LineId=2 LocnId=1 ProductNo="93002" BuyingLocn="0512" LineRef="31" Quantity=24 )" +
+        std::string("AllocateQty=18")}},
       // clang-format on
   };
   for (const auto& c : cases) {

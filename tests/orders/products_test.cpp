@@ -130,10 +130,11 @@ TEST_F(ProductsTest, PassesOverARecordThatTheStoreRefuses) {
 
 // The run ends at the bad line, whatever the trail answers; what came before it is stored.
 TEST_F(ProductsTest, KeepsAFileWithABadLine) {
+  const std::string products = kBall + "bad,line\n" + kTrain;
   for (const Button answer : {Button::kAbort, Button::kIgnore}) {
     trade_.answer = answer;
     trade_.reports.clear();
-    EXPECT_THAT(Import(kBall + "bad,line\n" + kTrain), IsEmpty());
+    EXPECT_THAT(Import(products), IsEmpty());
     EXPECT_THAT(
         trade_.reports,
         ElementsAre("TLE error - program error #13 (File " + (trade_.folder / "products.csv") +

@@ -32,8 +32,8 @@ TEST(X12PostingTest, StoresEveryMemberOfAnOrder) {
         R"(NotBefore=2006-03-10 CancelAfter=2006-03-24 DeptNo="0042" Header1="0104")" + control +
         R"( SourceFile="{file}" FilePos=168 Note="Advertised date 01/04/2006")",
         "LineId=1 OrderId=1 LineNo=\"7\" " + lines,
-        R"(LineId=2 OrderId=1 LineNo="8" ProductNo="93002" SKU="5550022" Quantity=5.5 UOM="EA" PriceCode="WE" )"
-        "Cost=3.25",
+        R"(LineId=2 OrderId=1 LineNo="8" ProductNo="93002" SKU="5550022" Quantity=5.5 UOM="EA" PriceCode="WE" )" +
+        std::string("Cost=3.25"),
         R"(LocnId=1 OrderId=1 VendorId="ACME" BuyingLocn="0512" ShipToLocn="0900")",
         R"(LocnId=2 OrderId=1 VendorId="ACME" BuyingLocn="0513" ShipToLocn="0900")",
         R"(LocnId=3 OrderId=1 VendorId="ACME" BuyingLocn="0900" ShipToLocn="0900")",

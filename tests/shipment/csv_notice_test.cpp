@@ -32,7 +32,9 @@ void PackFiveOrders(PackedTrade& trade) {
   for (int n = 2; n <= 11; ++n) trade.AddShipment([&](Shipment& load) { load.ConNoteNo = "CN" + std::to_string(n); });
   for (const auto& [shipment, order, shipTo] :
        {std::tuple(11, 1, "0900"), {1, 11, "0900"}, {1, 2, "0901"}, {1, 11, "0900"}, {1, 2, "0900"}}) {
-    trade.AddPack([&](Pack& each) { each.ShipmentId = shipment, each.OrderId = order, each.ShipToCode = shipTo; });
+    trade.AddPack([shipment = shipment, order = order, shipTo = shipTo](Pack& each) {
+      each.ShipmentId = shipment, each.OrderId = order, each.ShipToCode = shipTo;
+    });
   }
 }
 
@@ -75,8 +77,8 @@ TEST(CsvNoticeTest, StoresTheNotice) {
       "Id=1 ASNNo=\"1001\" VendorId=\"ACME\" PartnerId=\"MGB\" ShipmentId=1 OrderId=1 OrderNo=\"450001\" "
       "PartnerName=\"MGB Stores\" PartnerLocnId=44 ";
   const std::string rest = "DeliveryLocn=\"MGB Altona\" ConNoteNo=\"CN5\" CompileDate=2006-03-08T10:15:00";
-  for (const auto& [className, stored] :
-       {std::pair(kMgb, head + rest), {kKmartNotice, head + "ShipToCode=\"0900\" " + rest}}) {
+  const std::string byShipTo = head + "ShipToCode=\"0900\" " + rest;
+  for (const auto& [className, stored] : {std::pair(kMgb, head + rest), {kKmartNotice, byShipTo}}) {
     PackedTrade trade(className, "CONTAINERNO");
     trade.AddPack();
     EXPECT_EQ(trade.Run().front().result, 1);

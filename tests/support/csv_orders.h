@@ -3,7 +3,6 @@
 
 #include <algorithm>
 #include <map>
-#include <numeric>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -58,8 +57,9 @@ inline Texts UsualColumns() {
 }
 
 inline std::string MapText(const Texts& columns) {
-  return std::accumulate(columns.begin(), columns.end(), std::string(),
-                         [](std::string text, const std::string& column) { return text + column + "\r\n"; });
+  std::string text;
+  for (const std::string& column : columns) text.append(column).append("\r\n");
+  return text;
 }
 
 // A supplier of CSV orders, with a map.
