@@ -171,11 +171,12 @@ bool CompileFrame::Make(Notice& notice) {
   if (!Try([&] { Host().BeginTrans(); })) return false;
   try {
     const bool made = Number(notice) && OpenOutput(notice) && WriteNotice(notice) && NotePending(notice);
+    if (!made) ForgetAll(notice);
     if (Try([&] { Host().CommitTrans(); })) return made;
   } catch (...) {
     // What was told until then stays.
     const HandlerOff off(Errors());
-    for (const PendingNotice& pending : notice.pending) Try([&] { Forget(pending); });
+    ForgetAll(notice);
     if (!Try([&] { Host().CommitTrans(); })) notice.log.Ids().resize(told);
     throw;
   }
@@ -279,7 +280,10 @@ bool CompileFrame::WriteFiles(Notice& notice) {
 
 // A file that can't be cut back now is by the next run.
 void CompileFrame::GiveUp(Notice& notice) {
-  if (!notice.files.Abandon()) return;
+  if (notice.files.Abandon()) ForgetAll(notice);
+}
+
+void CompileFrame::ForgetAll(Notice& notice) {
   for (const PendingNotice& pending : notice.pending) Try([&] { Forget(pending); });
 }
 

@@ -97,6 +97,7 @@ class CompileFrame : public TranslatorBase {
   void TakeUpInterrupted(const Lookup& lookup, const PendingNotice& probe, const Tell& tell);
   void TakeBack(const PendingNotice& notice, const Tell& tell);
   void Forget(const PendingNotice& notice);
+  void ForgetAll(Notice& notice);
   std::optional<std::size_t> OpenFile(Notice& notice, const std::string& path);
   bool Make(Notice& notice);
   bool NotePending(Notice& notice);

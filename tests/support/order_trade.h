@@ -198,21 +198,6 @@ class OrderTrade : public TradingHost {
   // What the log got since the last `Start`.
   Texts NewLog() { return LogLines(started_); }
 
-  // One call of `Process`: its result, and what its error list names.
-  struct Outcome {
-    std::int32_t result = 0;
-    Texts told;
-  };
-  Outcome Process(Translator& importer, std::int32_t row) {
-    ErrorList ids;
-    Outcome outcome;
-    outcome.result = importer.Process(row, ids);
-    for (const std::int32_t id : ids.value_or(std::vector<std::int32_t>())) {
-      outcome.told.push_back(LogLines(id - 1).front());
-    }
-    return outcome;
-  }
-
   struct Run {
     std::int32_t rows = 0;
     std::vector<Outcome> outcomes;  // a row each

@@ -184,19 +184,6 @@ class PackedTrade : public TradingHost {
   }
   Texts NewLog() { return LogLines(started_); }
 
-  struct Outcome {
-    std::int32_t result = 0;
-    Texts told;  // what the error list names
-  };
-  Outcome Process(Translator& translator, std::int32_t row = 0) {
-    ErrorList ids;
-    Outcome outcome;
-    outcome.result = translator.Process(row, ids);
-    for (const std::int32_t id : ids.value_or(std::vector<std::int32_t>())) {
-      outcome.told.push_back(LogLines(id - 1).front());
-    }
-    return outcome;
-  }
   // Init, Load, Process of every row, Term.
   std::vector<Outcome> Run(std::string_view output = "out/asn.csv") {
     const auto translator = Loaded(output);

@@ -87,6 +87,21 @@ struct TradingHost {
     return lines;
   }
 
+  // One call of a translator's `Process`: its result, and what its error list names.
+  struct Outcome {
+    std::int32_t result = 0;
+    std::vector<std::string> told;
+  };
+  Outcome Process(Translator& translator, std::int32_t row = 0) {
+    ErrorList ids;
+    Outcome outcome;
+    outcome.result = translator.Process(row, ids);
+    for (const std::int32_t id : ids.value_or(std::vector<std::int32_t>())) {
+      outcome.told.push_back(LogLines(id - 1).front());
+    }
+    return outcome;
+  }
+
  private:
   Ports MakePorts() {
     Ports made = platform::DefaultPorts();
