@@ -37,6 +37,15 @@ class MemoryFiles : public Files {
     if (mode == OutputMode::kReplace) file->bytes.clear();
     return std::make_unique<Output>(file);
   }
+  std::unique_ptr<OutputFile> OpenDraft(const std::string& path, std::string& name) override {
+    name = path + ".draft";
+    return OpenOutput(name, OutputMode::kReplace);
+  }
+  bool RenameNew(const std::string& from, const std::string& to) override {
+    if (Exists(to)) return false;
+    Rename(from, to);
+    return true;
+  }
   void Delete(const std::string& path) override {
     Named(path);
     names_.erase(path);

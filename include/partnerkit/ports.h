@@ -15,6 +15,20 @@
 
 namespace partnerkit {
 
+// Who may do what with a file, as the platform keeps it. The library carries it from one file to another, unread.
+struct FileRights {
+  bool known = false;
+  std::uint32_t mode = 0;
+  std::uint32_t owner = 0, group = 0;
+};
+
+// What a file takes of them.
+enum class Take {
+  kAll,
+  kMode,
+  kNoMore,  // it loses what group and others have beyond them
+};
+
 // A file held open for reading. Every operation may raise RunTimeError.
 class InputFile {
  public:
@@ -27,6 +41,7 @@ class InputFile {
   // A text without blanks or line ends that tells this file from any other that bears its name before or after it: the
   // same while the file grows, another once it is replaced.
   virtual std::string Identity() = 0;
+  virtual FileRights Rights() { return {}; }
 };
 
 // A file held open for writing. Every operation may raise RunTimeError. A file that is let go without `Close` keeps
@@ -41,6 +56,9 @@ class OutputFile {
   // Cuts the file back to `length` bytes.
   virtual void Truncate(std::uint64_t length) = 0;
   virtual void Close() = 0;
+  // Gives the file the rights of another, as far as the platform lets us. False when owner or group, which were to be
+  // taken, stay what they were.
+  virtual bool TakeRights(const FileRights&, Take) { return true; }
 };
 
 enum class Share {
@@ -49,12 +67,14 @@ enum class Share {
 };
 
 enum class OutputMode {
-  kReplace,  // a new file, or an old one emptied
-  kAppend,   // a new file, or behind what the old one holds
+  kReplace,    // a new file, or an old one emptied
+  kAppend,     // a new file, or behind what the old one holds
+  kAppendOwn,  // the same of a file whose name we made up: a link that somebody else has put there is refused
 };
 
 // The file system. A "\" in a path counts as the platform's separator where no file of that very name exists. Failures
-// raise RunTimeError with the numbers of `run_time`.
+// raise RunTimeError with the numbers of `run_time`. A file is made only under a name that stands for nothing: a link
+// that leads nowhere is refused, not followed.
 class Files {
  public:
   virtual ~Files() = default;
@@ -62,15 +82,24 @@ class Files {
   virtual bool Exists(const std::string& path) = 0;
   // The path in a form that means the same file to a later run, started in another folder.
   virtual std::string FullName(const std::string& path) { return path; }
+  // Where a link of that name leads to in the end; the path itself for any other file.
+  virtual std::string Resolved(const std::string& path) { return path; }
   virtual std::unique_ptr<InputFile> OpenInput(const std::string& path, Share share) = 0;
   // Exclusive: an output file is never shared.
   virtual std::unique_ptr<OutputFile> OpenOutput(const std::string& path, OutputMode mode) = 0;
+  // A new, empty file beside `path`, held like any output, for what is to take the place of `path` by a rename. It has
+  // a name of its own, told in `name`, that no other program's file has; no link is followed. What a killed program
+  // left of an earlier draft of the same path is cleared away.
+  virtual std::unique_ptr<OutputFile> OpenDraft(const std::string& path, std::string& name) = 0;
   virtual void Delete(const std::string& path) = 0;
   // Gives `from` the name `to` in one step, in the place of a file that has it; durable when it returns.
   virtual void Rename(const std::string& from, const std::string& to) = 0;
+  // The same, but never in the place of a file: False, and nothing done, when one has the name `to`.
+  virtual bool RenameNew(const std::string& from, const std::string& to) = 0;
   // Makes the last folder of the path. Raises for one that is there.
   virtual void CreateFolder(const std::string& path) = 0;
-  // Copies a file, in the place of one that has the name `to`. What is there under that name is whole at any moment.
+  // Copies a file with its mode, in the place of one that has the name `to`. What is there under that name is whole at
+  // any moment.
   virtual void Copy(const std::string& from, const std::string& to) = 0;
 };
 
@@ -116,6 +145,12 @@ struct ErrorSettings {
 
 class Spooler;
 
+// Something about his files that the user should know, beside what the run log tells.
+enum class Told {
+  kDone,    // a file of another was moved aside, say
+  kFailed,  // a file could not be put in its place, or removed
+};
+
 // Everything a class is handed at its creation. The objects must outlive the class.
 struct Ports {
   Files* files = nullptr;
@@ -127,6 +162,8 @@ struct Ports {
   Spooler* spooler = nullptr;
   // Called between labels and while a print queue is full, for a host to keep its windows alive. May be empty.
   std::function<void()> yield;
+  // One sentence for the user. Where it is empty, a warning on the run log takes its place.
+  std::function<void(Told, const std::string& sentence)> tell;
   ErrorOutlets errorOutlets;
   ErrorSettings errorSettings;
 };

@@ -352,6 +352,18 @@ struct OrderLocnLine {
   std::int32_t OrderLineId() const { return LineId; }
 };
 
+// An order that was posted from a file which still holds it: a program that stops before the file is settled leaves the
+// record behind, so that the next one knows the order for its own work.
+struct UnsettledOrder {
+  static const RecordType kType;
+  static const Lookup kByFileName;  // of a document definition
+
+  std::int32_t OrderId = 0;
+  std::int32_t EDIDocId = 0;
+  std::string FileName;
+  bool BackedUp = false;
+};
+
 // A packing job for an order.
 struct Job {
   static const RecordType kType;

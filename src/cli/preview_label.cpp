@@ -56,12 +56,13 @@ class PreviewPrinter : public Spooler {
 
 // A file of that name is there whole or not at all.
 void WriteWhole(Files& files, const std::string& name, std::string_view bytes) {
-  const std::string draft = name + ".draft";
+  std::string draft;
   try {
-    const std::unique_ptr<OutputFile> file = files.OpenOutput(draft, OutputMode::kReplace);
+    const std::unique_ptr<OutputFile> file = files.OpenDraft(name, draft);
     file->Write(bytes);
-    file->Close();
+    file->Sync();
     files.Rename(draft, name);
+    file->Close();
   } catch (const RunTimeError& error) {
     std::error_code ignored;
     std::filesystem::remove(draft, ignored);

@@ -51,6 +51,7 @@ class ProgressFiles::Input : public InputFile {
   std::uint64_t Length() override { return file_->Length(); }
   bool StillNamed(const std::string& path) override { return file_->StillNamed(path); }
   std::string Identity() override { return file_->Identity(); }
+  FileRights Rights() override { return file_->Rights(); }
 
  private:
   std::unique_ptr<InputFile> file_;

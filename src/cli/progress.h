@@ -42,7 +42,12 @@ class ProgressFiles : public Files {
   std::unique_ptr<OutputFile> OpenOutput(const std::string& path, OutputMode mode) override {
     return files_.OpenOutput(path, mode);
   }
+  std::unique_ptr<OutputFile> OpenDraft(const std::string& path, std::string& name) override {
+    return files_.OpenDraft(path, name);
+  }
+  std::string Resolved(const std::string& path) override { return files_.Resolved(path); }
   void Delete(const std::string& path) override { files_.Delete(path); }
+  bool RenameNew(const std::string& from, const std::string& to) override { return files_.RenameNew(from, to); }
   void Rename(const std::string& from, const std::string& to) override { files_.Rename(from, to); }
   void CreateFolder(const std::string& path) override { files_.CreateFolder(path); }
   void Copy(const std::string& from, const std::string& to) override { files_.Copy(from, to); }

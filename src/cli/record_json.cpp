@@ -122,8 +122,9 @@ void CopyAs(const void* from, void* to) {
 
 std::shared_ptr<void> NewRecord(const RecordType& type) {
   return NewOneOf<Partner, Vendor, EDIDoc, PartnerAddress, PartnerLocn, Product, ProductPrice, ProductInner, Prepack,
-                  PackType, Printer, LabelJob, LabelJobItem, Order, OrderLine, OrderLocn, OrderLocnLine, Job, PSlip,
-                  PSlipLine, Shipment, ASN, PendingNotice, Pack, PackLine, PADRecord, PADItem, PADStore, Log>(type);
+                  PackType, Printer, LabelJob, LabelJobItem, Order, OrderLine, OrderLocn, OrderLocnLine, UnsettledOrder,
+                  Job, PSlip, PSlipLine, Shipment, ASN, PendingNotice, Pack, PackLine, PADRecord, PADItem, PADStore,
+                  Log>(type);
 }
 
 std::span<const NestedKind> NestedKinds() { return kNestedKinds; }

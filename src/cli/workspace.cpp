@@ -107,6 +107,10 @@ Workspace::Workspace(const Command& command) : command_(command), folder_(Checke
     Tell(report.report);
     return Button::kAbort;
   };
+  ports_.tell = [this](Told kind, const std::string& sentence) {
+    if (kind == Told::kFailed) hadFault_ = true;
+    command_.Say(sentence);
+  };
   if (options.now) {
     fixedClock_.emplace(*options.now);
     ports_.clock = &*fixedClock_;

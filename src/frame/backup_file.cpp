@@ -1,4 +1,5 @@
 #include <algorithm>
+#include <utility>
 
 #include "frame/line_reader.h"
 #include "frame/note_lines.h"
@@ -12,12 +13,14 @@ struct BackupFile::Note {
   std::string sourcePath;
   std::string sourceIdentity;
   std::vector<ByteRange> ranges;
+  std::vector<std::int32_t> orders;
 };
 
 namespace {
 
 constexpr std::string_view kNoteHead = "partnerkit backup 1";
 constexpr std::string_view kNoteFoot = "end";
+constexpr std::string_view kOrder = "order";
 
 }  // namespace
 
@@ -38,6 +41,10 @@ std::optional<BackupFile::Note> BackupFile::ReadNote(InputFile& file) {
     if (line.text == kNoteFoot) return note;
     const std::size_t blank = line.text.find(' ');
     if (blank == std::string_view::npos) return std::nullopt;
+    if (line.text.substr(0, blank) == kOrder) {
+      note.orders.push_back(static_cast<std::int32_t>(WholeNumber(line.text.substr(blank + 1)).value_or(0)));
+      continue;
+    }
     const auto begin = WholeNumber(line.text.substr(0, blank));
     const auto end = WholeNumber(line.text.substr(blank + 1));
     if (!begin || !end) return std::nullopt;
@@ -63,10 +70,12 @@ void BackupFile::Close() {
   file->Close();
 }
 
-void BackupFile::Append(InputFile& source, const std::string& sourcePath, const std::vector<ByteRange>& ranges) {
+void BackupFile::Append(InputFile& source, const std::string& sourcePath, const std::vector<ByteRange>& ranges,
+                        const std::vector<std::int32_t>& orders) {
   if (ranges.empty()) return;
   const std::uint64_t base = file_->Length();
-  WriteNote(source, sourcePath, ranges);
+  file_->TakeRights(source.Rights(), base == 0 ? Take::kMode : Take::kNoMore);
+  WriteNote(source, sourcePath, ranges, orders);
   try {
     CopyRanges(source, ranges);
   } catch (const RunTimeError&) {
@@ -76,19 +85,22 @@ void BackupFile::Append(InputFile& source, const std::string& sourcePath, const 
 }
 
 void BackupFile::Settle() {
+  finished_.clear();
   if (!pending_) return;
   files_.Delete(NotePath());
   pending_ = false;
 }
 
-void BackupFile::WriteNote(InputFile& source, const std::string& sourcePath, const std::vector<ByteRange>& ranges) {
-  const std::string draft = DraftPath();
-  const std::unique_ptr<OutputFile> note = files_.OpenOutput(draft, OutputMode::kReplace);
+void BackupFile::WriteNote(InputFile& source, const std::string& sourcePath, const std::vector<ByteRange>& ranges,
+                           const std::vector<std::int32_t>& orders) {
+  std::string draft;
+  const std::unique_ptr<OutputFile> note = files_.OpenDraft(NotePath(), draft);
   note->Write(std::string(kNoteHead) + '\n' + std::to_string(file_->Length()) + '\n' + NoteLine(sourcePath) + '\n' +
               source.Identity() + '\n');
   for (const ByteRange& range : ranges) {
     note->Write(std::to_string(range.begin) + ' ' + std::to_string(range.end) + '\n');
   }
+  for (const std::int32_t order : orders) note->Write(std::string(kOrder) + ' ' + std::to_string(order) + '\n');
   note->Write(std::string(kNoteFoot) + '\n');
   note->Sync();
   files_.Rename(draft, NotePath());
@@ -97,8 +109,6 @@ void BackupFile::WriteNote(InputFile& source, const std::string& sourcePath, con
 }
 
 void BackupFile::FinishPending() {
-  // A note that never got its name tells of nothing that was begun.
-  if (files_.Exists(DraftPath())) files_.Delete(DraftPath());
   if (!files_.Exists(NotePath())) return;
   std::optional<Note> note;
   {
@@ -106,25 +116,27 @@ void BackupFile::FinishPending() {
     note = ReadNote(*file);
   }
   pending_ = true;
-  if (note) Finish(*note);
-  Settle();
+  if (note && Finish(*note)) finished_ = std::move(note->orders);
 }
 
 // The order file is replaced only after the backup is on the disk. So while it is the one noted, its lines are appended
 // again from where the backup stood; once it is another, the backup is whole, unless somebody else took the order file
-// away between the two: then the half that was appended goes, for a broken line is worse than none.
-void BackupFile::Finish(const Note& note) {
+// away between the two: then the half that was appended goes, for a broken line is worse than none. True when the
+// backup holds the lines.
+bool BackupFile::Finish(const Note& note) {
   if (files_.Exists(note.sourcePath)) {
     const std::unique_ptr<InputFile> source = files_.OpenInput(note.sourcePath, Share::kExclusive);
     if (source->Identity() == note.sourceIdentity) {
       file_->Truncate(std::min(note.base, file_->Length()));
       CopyRanges(*source, note.ranges);
-      return;
+      return true;
     }
   }
   std::uint64_t whole = note.base;
   for (const ByteRange& range : note.ranges) whole += range.end - range.begin;
-  if (file_->Length() < whole) file_->Truncate(std::min(note.base, file_->Length()));
+  if (file_->Length() >= whole) return true;
+  file_->Truncate(std::min(note.base, file_->Length()));
+  return false;
 }
 
 void BackupFile::CopyRanges(InputFile& source, const std::vector<ByteRange>& ranges) {

@@ -87,7 +87,9 @@ void ErrorTrail::AppendToLogFile(const ErrorReport& report) const {
 void ErrorTrail::SendMail(const ErrorReport& report) const {
   if (settings_.mailRecipient.empty() || !outlets_.mail) return;
   const std::string file(kMailedFile);
-  Quietly([&] { WriteLine(*files_.OpenOutput(file, OutputMode::kReplace), report.report); });
+  // The old one goes, whatever it is: nothing is written through a link that somebody has put there.
+  Quietly([&] { files_.Delete(file); });
+  Quietly([&] { WriteLine(*files_.OpenOutput(file, OutputMode::kAppendOwn), report.report); });
   Quietly([&] {
     outlets_.mail({.recipient = settings_.mailRecipient,
                    .subject = "Remote Error Report From " + outlets_.libraryPath,

@@ -27,6 +27,11 @@ HostedClass::HostedClass(std::string_view className, const Ports& ports, std::st
 
 HostedClass::~HostedClass() { --liveObjects; }
 
+void HostedClass::Tell(Told kind, const std::string& sentence) {
+  if (ports_.tell) ports_.tell(kind, sentence);
+  else WriteLog(kWarning, "Tell", sentence);
+}
+
 std::int32_t HostedClass::WriteLog(std::int32_t number, std::string_view procedure, std::string_view message) {
   const std::int32_t native = number == run_time::kDatabase ? Records().NativeError() : 0;
   return Procedure("Sub WriteLog", std::int32_t{0}, [&](std::int32_t& id) {

@@ -29,6 +29,9 @@ class HostedClass {
   // operation that called it. For the database layer's error the record carries the database's own number as well.
   std::int32_t WriteLog(std::int32_t number, std::string_view procedure, std::string_view message);
 
+  // Tells the user something about his files, see Ports::tell.
+  void Tell(Told kind, const std::string& sentence);
+
   // The run-time error of the last operation that failed in a foreseen way, 0 when none did.
   std::int32_t ErrorNumber() const { return errors_.Number(); }
 

@@ -1,8 +1,17 @@
 #include "frame/line_reader.h"
 
+#include <algorithm>
 #include <cstring>
+#include <span>
+#include <string>
 
 namespace partnerkit {
+
+namespace {
+
+constexpr char kCtrlZ = '\x1A';
+
+}  // namespace
 
 void LineReader::Seek(std::uint64_t position) {
   const std::uint64_t offset = position - 1;
@@ -20,8 +29,7 @@ bool LineReader::Read(Line& line) {
     const std::size_t end = FindEnd();
     if (end == filled_) {
       if (Fill()) continue;
-      if (begin_ == filled_) return false;
-      return Give(line, filled_ - begin_, filled_);
+      return GiveLast(line);
     }
     if (buffer_[end] == '\n') return Give(line, end - begin_, end + 1);
     // A CR: the LF of a CR LF pair may lie in the next block.
@@ -54,6 +62,10 @@ bool LineReader::Fill() {
     filled_ -= begin_;
     begin_ = 0;
   } else if (filled_ == buffer_.size()) {
+    if (filled_ >= kLongestLine) {
+      throw LineTooLong(run_time::kOverflow,
+                        "The line at byte " + std::to_string(Position()) + " is longer than 64 MB");
+    }
     buffer_.resize(buffer_.size() * 2);
   }
   feedKnown_ = false;
@@ -62,10 +74,23 @@ bool LineReader::Fill() {
   return read > 0;
 }
 
+// What stands behind the last line end. False when that is nothing, or nothing but Ctrl-Z.
+bool LineReader::GiveLast(Line& line) {
+  std::size_t end = filled_;
+  while (end > begin_ && buffer_[end - 1] == kCtrlZ) --end;
+  if (end == begin_) return false;
+  const bool ended = end < filled_;
+  Give(line, end - begin_, end);
+  line.ended = ended;
+  return true;
+}
+
 bool LineReader::Give(Line& line, std::size_t length, std::size_t end) {
   line.position = Position();
   line.text = {buffer_.data() + begin_, length};
   line.raw = {buffer_.data() + begin_, end - begin_};
+  line.ended = true;
+  if (line.text.starts_with(kCtrlZ)) line.text.remove_prefix(std::min(line.text.find_first_not_of(kCtrlZ), length));
   begin_ = end;
   return true;
 }

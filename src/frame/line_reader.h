@@ -13,14 +13,26 @@ struct Line {
   std::uint64_t position = 1;  // of the first byte, counted from 1
   std::string_view text;       // without its line end
   std::string_view raw;        // with it, as it stands in the file
+  bool ended = true;           // false for a last line without an end, which may be an upload that isn't finished
 
   // Where the next line begins.
   std::uint64_t End() const { return position + raw.size(); }
 };
 
+// A line that is longer than any may be.
+class LineTooLong : public RunTimeError {
+ public:
+  using RunTimeError::RunTimeError;
+};
+
 // A line ends at LF, CR LF or a lone CR, so that files from every system read alike; the last one may have no end.
+// Ctrl-Z, with which old systems end a file, is no part of any line: at the file's end it is left unread, and one that
+// a file was appended to behind is passed over with the line that it stands in front of.
 class LineReader {
  public:
+  // No partner's line comes near it; a longer one is no text, and must not fill the memory.
+  static constexpr std::size_t kLongestLine = 64 * 1024 * 1024;
+
   explicit LineReader(InputFile& file, std::size_t block = 256 * 1024) : file_(file), buffer_(block) {}
 
   // The next read begins at this byte position, from 1.
@@ -28,12 +40,13 @@ class LineReader {
   // Where the next read begins.
   std::uint64_t Position() const { return base_ + begin_ + 1; }
   // False at the end of the file, as long as it doesn't grow. The views stay valid until the next Read or Seek. Raises
-  // RunTimeError, the position then unchanged.
+  // RunTimeError, the position then unchanged; LineTooLong for a line beyond the longest.
   bool Read(Line& line);
 
  private:
   std::size_t FindEnd();
   bool Fill();
+  bool GiveLast(Line& line);
   bool Give(Line& line, std::size_t length, std::size_t end);
 
   InputFile& file_;

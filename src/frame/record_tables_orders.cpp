@@ -150,6 +150,18 @@ constexpr RecordType OrderLocnLine::kType = {
     "OrderLocnLine", "tbOrderLocnLine", kOrderLocnLineMembers, kOrderLocnLineLookups,
     "The quantity of a product for one location of an order."};
 
+constexpr Member kUnsettledOrderMembers[] = {
+    Key<&UnsettledOrder::OrderId>   ("OrderId"),
+    Field<&UnsettledOrder::EDIDocId>("EDIDocId"),
+    Field<&UnsettledOrder::FileName>("FileName"),
+    Field<&UnsettledOrder::BackedUp>("BackedUp"),
+};
+constexpr std::string_view kUnsettledFileName[] = {"EDIDocId", "FileName"};
+constexpr Lookup UnsettledOrder::kByFileName = {"ByFileName", kUnsettledFileName};
+constexpr Lookup kUnsettledOrderLookups[] = {UnsettledOrder::kByFileName};
+constexpr RecordType UnsettledOrder::kType = {"UnsettledOrder", "tbUnsettledOrder", kUnsettledOrderMembers,
+    kUnsettledOrderLookups, "A posted order whose file isn't settled yet, and still holds it."};
+
 // clang-format on
 
 }  // namespace partnerkit

@@ -6,14 +6,21 @@ namespace partnerkit {
 namespace {
 
 constexpr const RecordType* kAllTypes[] = {
-    &Partner::kType,       &Vendor::kType,    &EDIDoc::kType,        &PartnerAddress::kType,
-    &PartnerLocn::kType,   &Product::kType,   &ProductPrice::kType,  &ProductInner::kType,
-    &Prepack::kType,       &PackType::kType,  &Printer::kType,       &LabelJob::kType,
-    &LabelJobItem::kType,  &Order::kType,     &OrderLine::kType,     &OrderLocn::kType,
-    &OrderLocnLine::kType, &Job::kType,       &PSlip::kType,         &PSlipLine::kType,
-    &Shipment::kType,      &ASN::kType,       &PendingNotice::kType, &Pack::kType,
-    &PackLine::kType,      &PADRecord::kType, &PADItem::kType,       &PADStore::kType,
-    &Log::kType,
+    &Partner::kType,       &Vendor::kType,
+    &EDIDoc::kType,        &PartnerAddress::kType,
+    &PartnerLocn::kType,   &Product::kType,
+    &ProductPrice::kType,  &ProductInner::kType,
+    &Prepack::kType,       &PackType::kType,
+    &Printer::kType,       &LabelJob::kType,
+    &LabelJobItem::kType,  &Order::kType,
+    &OrderLine::kType,     &OrderLocn::kType,
+    &OrderLocnLine::kType, &UnsettledOrder::kType,
+    &Job::kType,           &PSlip::kType,
+    &PSlipLine::kType,     &Shipment::kType,
+    &ASN::kType,           &PendingNotice::kType,
+    &Pack::kType,          &PackLine::kType,
+    &PADRecord::kType,     &PADItem::kType,
+    &PADStore::kType,      &Log::kType,
 };
 
 }  // namespace

@@ -12,6 +12,9 @@ namespace {
 // What is kept of an overlong segment: enough to tell what it is.
 constexpr std::size_t kFront = 256;
 
+// Old systems end a file with it.
+constexpr char kCtrlZ = '\x1A';
+
 constexpr std::uint64_t kOnes = 0x0101010101010101;
 
 constexpr std::uint64_t Repeated(char c) { return kOnes * static_cast<unsigned char>(c); }
@@ -21,13 +24,13 @@ constexpr std::uint64_t Below(std::uint64_t bytes, unsigned limit) {
   return (bytes - kOnes * limit) & ~bytes & (kOnes * 0x80);
 }
 
-bool IsLineEnd(char c) { return c == '\r' || c == '\n'; }
+bool IsLineEnd(char c) { return c == '\r' || c == '\n' || c == kCtrlZ; }
 
 }  // namespace
 
 SegmentReader::SegmentReader(InputFile& file, const SegmentSyntax& syntax, std::size_t block)
     : file_(file), syntax_(syntax), buffer_(block) {
-  for (const char end : {'\r', '\n', syntax.terminator, syntax.otherEnd}) {
+  for (const char end : {'\r', '\n', kCtrlZ, syntax.terminator, syntax.otherEnd}) {
     if (end != '\0') ends_[static_cast<unsigned char>(end)] = true;
   }
 }
@@ -78,7 +81,7 @@ std::size_t SegmentReader::FindEnd(std::size_t from) const {
     while (from + sizeof(std::uint64_t) <= filled_) {
       std::uint64_t eight;
       std::memcpy(&eight, bytes + from, sizeof eight);
-      const std::uint64_t found = Below(eight, '\r' + 1) | Below(eight ^ terminator, 1) | Below(eight ^ other, 1);
+      const std::uint64_t found = Below(eight, kCtrlZ + 1) | Below(eight ^ terminator, 1) | Below(eight ^ other, 1);
       if (found == 0) {
         from += sizeof eight;
         continue;

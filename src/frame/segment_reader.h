@@ -10,8 +10,8 @@
 
 namespace partnerkit {
 
-// What ends a segment. Line ends always do, and belong to none; blank lines and the second half of a CR LF are passed
-// over in front of a segment.
+// What ends a segment. Line ends always do, and Ctrl-Z, with which old systems end a file; they belong to none. Blank
+// lines and the second half of a CR LF are passed over in front of a segment.
 struct SegmentSyntax {
   char terminator = '~';    // ends a segment and belongs to it; NUL when lines alone end segments
   char otherEnd = '\0';     // ends a segment too, and belongs to none; NUL when there is no such character

@@ -1,7 +1,9 @@
 #include "frame/work_queue.h"
 
 #include <algorithm>
+#include <array>
 #include <span>
+#include <utility>
 
 namespace partnerkit {
 
@@ -13,9 +15,34 @@ std::string TemporaryName(std::string_view path) {
   return temporary == path ? temporary + ".tmp" : temporary;
 }
 
+bool IsEnvelopeSegment(std::string_view text) {
+  constexpr std::string_view kTags[] = {"ISA", "GS*", "ST*", "IEA", "GE*", "SE*", "UNB", "UNH", "UNT", "UNZ"};
+  return std::ranges::find(kTags, text.substr(0, 3)) != std::end(kTags);
+}
+
+std::string RenameToFree(Files& files, const std::string& from, const std::string& name) {
+  std::string free = name;
+  for (int number = 1; !files.RenameNew(from, free); ++number) free = name + "." + std::to_string(number);
+  return free;
+}
+
+namespace {
+
+constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
+
+std::uint64_t BehindByteOrderMark(InputFile& file) {
+  std::array<char, 3> front{};
+  const std::size_t read = file.ReadAt(0, front);
+  return std::string_view(front.data(), read) == kByteOrderMark ? kByteOrderMark.size() + 1 : 1;
+}
+
+}  // namespace
+
 void WorkQueue::Open(const std::string& path) {
   path_ = path;
+  target_ = files_.Resolved(path);
   file_ = files_.OpenInput(path, Share::kExclusive);
+  begin_ = BehindByteOrderMark(*file_);
 }
 
 void WorkQueue::Close() { file_.reset(); }
@@ -25,44 +52,99 @@ InputFile& WorkQueue::File() {
   return *file_;
 }
 
-WorkQueue::Rewrite::Rewrite(WorkQueue& queue) : queue_(queue), temporary_(TemporaryName(queue.path_)) {}
+WorkQueue::Rewrite::Rewrite(WorkQueue& queue, Tell tell)
+    : queue_(queue), tell_(std::move(tell)), temporary_(TemporaryName(queue.target_)) {}
 
 WorkQueue::Rewrite::~Rewrite() {
   if (!out_) return;
-  out_.reset();
   try {
-    queue_.files_.Delete(temporary_);
+    queue_.files_.Delete(draft_);
   } catch (const RunTimeError&) {
-    // It stays beside the order file, as it does when the order file cannot be replaced; the next rewrite clears it.
+    // The next rewrite clears it away.
   }
 }
 
 void WorkQueue::Rewrite::Begin() {
-  try {
-    queue_.files_.Delete(temporary_);
-  } catch (const RunTimeError&) {
-    // There is none, as a rule.
+  Files& files = queue_.files_;
+  if (out_) {
+    out_.reset();
+    files.Delete(draft_);
   }
-  out_ = queue_.files_.OpenOutput(temporary_, OutputMode::kReplace);
+  if (files.Exists(temporary_) && !SaysNothing(temporary_)) MoveAside(temporary_);
+  out_ = files.OpenDraft(queue_.target_, draft_);
+  if (!out_->TakeRights(queue_.File().Rights(), Take::kAll)) {
+    tell_("The owner or the group of " + queue_.path_ + " cannot be kept: it is rewritten as a file of another's");
+  }
+}
+
+// An earlier run may have left it with envelopes of nothing, or a mailbox have just begun to write to it: no reason to
+// move it.
+bool WorkQueue::Rewrite::SaysNothing(const std::string& path) {
+  std::vector<char> block(64 * 1024);
+  try {
+    const std::unique_ptr<InputFile> file = queue_.files_.OpenInput(path, Share::kDenyWrite);
+    if (file->Length() > block.size()) return false;
+    std::string_view rest(block.data(), file->ReadAt(0, block));
+    while (!rest.empty()) {
+      const std::string_view segment = rest.substr(0, rest.find_first_of("~\r\n"));
+      if (segment.find_first_not_of(' ') != std::string_view::npos && !IsEnvelopeSegment(segment)) return false;
+      rest.remove_prefix(std::min(rest.size(), segment.size() + 1));
+    }
+    return true;
+  } catch (const RunTimeError&) {
+    return false;
+  }
+}
+
+void WorkQueue::Rewrite::MoveAside(const std::string& path) {
+  const std::string moved = RenameToFree(queue_.files_, path, path);
+  tell_("The file " + path + " was there already and is now " + moved);
+}
+
+// Gives the draft its name before its hold ends: nobody then takes it for left over. A call that is tried again finds
+// it there.
+const std::string& WorkQueue::Rewrite::Leave(const std::string& name) {
+  if (!out_) return draft_;
+  draft_ = RenameToFree(queue_.files_, draft_, name);
+  std::exchange(out_, nullptr)->Close();
+  return draft_;
 }
 
 void WorkQueue::Rewrite::Claim() {
-  const std::unique_ptr<OutputFile> out = std::move(out_);
-  if (out) out->Close();
-  if (!queue_.File().StillNamed(queue_.path_)) {
-    // The next rewrite would clear the temporary file away.
-    const std::string kept = queue_.path_ + ".kept";
-    queue_.files_.Rename(temporary_, kept);
-    throw RunTimeError(run_time::kFileNotFound,
-                       "The file " + queue_.path_ + " was taken away or replaced; what is left of it is in " + kept);
-  }
+  if (queue_.File().StillNamed(queue_.path_) && queue_.File().StillNamed(queue_.target_)) return;
+  throw RunTimeError(run_time::kFileNotFound, "The file " + queue_.path_ +
+                                                  " was taken away or replaced; what is left of it is in " +
+                                                  Leave(queue_.target_ + ".kept"));
 }
 
-void WorkQueue::Rewrite::Replace() { queue_.files_.Rename(temporary_, queue_.path_); }
+void WorkQueue::Rewrite::Fail(const RunTimeError& cause, const std::string& what) {
+  throw RunTimeError(cause.Number(), "The file " + queue_.path_ + " cannot be " + what + " and keeps all its lines (" +
+                                         cause.Description() + "); what should be left of it is in " +
+                                         Leave(temporary_));
+}
+
+void WorkQueue::Rewrite::Replace() {
+  try {
+    queue_.files_.Rename(draft_, queue_.target_);
+  } catch (const RunTimeError& error) {
+    Fail(error, "replaced");
+  }
+  if (out_) std::exchange(out_, nullptr)->Close();
+}
 
 void WorkQueue::Rewrite::Remove(bool withTemporary) {
-  queue_.files_.Delete(queue_.path_);
-  if (withTemporary) queue_.files_.Delete(temporary_);
+  try {
+    queue_.files_.Delete(queue_.target_);
+  } catch (const RunTimeError& error) {
+    Fail(error, "removed");
+  }
+  // One that an earlier run left says as little.
+  if (!withTemporary && !queue_.files_.Exists(temporary_)) {
+    Leave(temporary_);
+    return;
+  }
+  queue_.files_.Delete(draft_);
+  out_.reset();
 }
 
 void WorkQueue::Rewrite::KeepRange(ByteRange range) {

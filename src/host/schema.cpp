@@ -15,7 +15,8 @@ constexpr std::string_view kVersionTable = "tbSchemaVersion";
 
 // An import writes these row by row, and each index of theirs is paid for with every row. A look-up that names more
 // than the owner filters the owner's few rows.
-constexpr std::array<std::string_view, 4> kBulkTables = {"tbOrder", "tbOrderLine", "tbOrderLocn", "tbOrderLocnLine"};
+constexpr std::array<std::string_view, 5> kBulkTables = {"tbOrder", "tbOrderLine", "tbOrderLocn", "tbOrderLocnLine",
+                                                         "tbUnsettledOrder"};
 
 // Lines and the like go with their owner, so nothing is left to take a later one for them.
 bool IsOwned(const RecordType& type) {

@@ -14,7 +14,7 @@ class SqlSession;
 struct Dialect;
 
 // Goes up with every change of a record type that a released program's database would not fit.
-inline constexpr std::int32_t kSchemaVersion = 1;
+inline constexpr std::int32_t kSchemaVersion = 2;
 
 // Settings by name, the members of `System`.
 inline constexpr std::string_view kSettingsTable = "tbSystem";

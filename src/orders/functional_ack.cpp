@@ -1,7 +1,10 @@
 #include "orders/functional_ack.h"
 
+#include <memory>
 #include <optional>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include "frame/file_name.h"
 #include "frame/format.h"
@@ -11,46 +14,54 @@ namespace partnerkit::orders {
 namespace {
 
 // A file that gets a whole acknowledgement or none, even from a program that dies over it: what it will hold is written
-// beside it and takes its place. One that then holds nothing goes: a mailbox would send it.
+// beside it and takes its place. A mailbox never sees an empty one.
 class AckFile {
  public:
-  AckFile(Files& files, std::string path)
-      : files_(files),
-        path_(std::move(path)),
-        held_(files.OpenOutput(path_, OutputMode::kAppend)),
-        holdsOthers_(held_->Length() > 0) {}
+  AckFile(Files& files, std::string path) : files_(files), path_(std::move(path)) {
+    if (files_.Resolved(path_) != path_) {
+      throw RunTimeError(run_time::kPathAccess, "The name is a link of somebody else's: " + path_);
+    }
+    if (files_.Exists(path_)) earlier_ = files_.OpenInput(path_, Share::kExclusive);
+    draft_ = files_.OpenDraft(path_, draftName_);
+  }
   ~AckFile() {
     if (whole_) return;
-    Discard(draft_);
-    if (!holdsOthers_) Discard(path_);
+    try {
+      files_.Delete(draftName_);
+    } catch (const RunTimeError&) {
+      // It stays until the next acknowledgement of that name.
+    }
   }
   AckFile(const AckFile&) = delete;
   AckFile& operator=(const AckFile&) = delete;
 
   void Write(std::string_view text) {
-    if (holdsOthers_) files_.Copy(path_, draft_);
-    const auto draft = files_.OpenOutput(draft_, holdsOthers_ ? OutputMode::kAppend : OutputMode::kReplace);
-    draft->Write(text);
-    draft->Sync();
-    draft->Close();
-    files_.Rename(draft_, path_);
+    draft_->Truncate(0);
+    if (earlier_) CopyEarlier();
+    draft_->Write(text);
+    draft_->Sync();
+    if (earlier_) {
+      files_.Rename(draftName_, path_);
+    } else if (!files_.RenameNew(draftName_, path_)) {
+      throw RunTimeError(run_time::kFileExists, "Another program has just made the file: " + path_);
+    }
     whole_ = true;
+    draft_->Close();
   }
 
  private:
-  void Discard(const std::string& path) {
-    try {
-      files_.Delete(path);
-    } catch (const RunTimeError&) {
-      // It stays; a later acknowledgement of that name takes its place.
+  void CopyEarlier() {
+    std::vector<char> block(64 * 1024);
+    for (std::uint64_t offset = 0; const std::size_t read = earlier_->ReadAt(offset, block); offset += read) {
+      draft_->Write({block.data(), read});
     }
+    draft_->TakeRights(earlier_->Rights(), Take::kAll);
   }
 
   Files& files_;
-  std::string path_;
-  std::string draft_ = path_ + ".tmp";
-  std::unique_ptr<OutputFile> held_;
-  bool holdsOthers_;
+  std::string path_, draftName_;
+  std::unique_ptr<InputFile> earlier_;  // what it holds already
+  std::unique_ptr<OutputFile> draft_;
   bool whole_ = false;
 };
 

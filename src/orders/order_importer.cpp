@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "frame/numbers.h"
 #include "orders/order_columns.h"
 #include "orders/order_store.h"
 
@@ -13,9 +14,10 @@ constexpr std::string_view kDeleteOnEmpty = "#%DELETEONEMPTY";
 
 }  // namespace
 
-bool IsEnvelopeSegment(std::string_view text) {
-  constexpr std::string_view kTags[] = {"ISA", "GS*", "ST*", "IEA", "GE*", "SE*", "UNB", "UNH", "UNT", "UNZ"};
-  return std::ranges::find(kTags, text.substr(0, 3)) != std::end(kTags);
+std::string AsPartOfSentence(std::string text) {
+  if (!text.empty() && text.front() >= 'A' && text.front() <= 'Z')
+    text.front() = static_cast<char>(text.front() + ('a' - 'A'));
+  return text;
 }
 
 bool OrderImporter::FindOrderFile(const std::string& path) {
@@ -83,10 +85,89 @@ std::optional<std::uint64_t> OrderImporter::EndOf(const ListedOrder& entry) {
 void OrderImporter::DeleteWhenEmpty(bool optionAnywhere) {
   const std::string_view options = Str(Document().Options);
   if (optionAnywhere ? options.find(kDeleteOnEmpty) == std::string_view::npos : options != kDeleteOnEmpty) return;
-  const HandlerOff off(Errors());
-  Try([&] {
-    if (FileSystem().Length(fileName_) == 0) FileSystem().Delete(fileName_);
+  PutInPlace([&] {
+    Files& files = FileSystem();
+    if (files.Exists(fileName_) && files.Length(fileName_) == 0) files.Delete(files.Resolved(fileName_));
   });
+}
+
+UnsettledOrder OrderImporter::NoteOf(std::int32_t orderId) {
+  UnsettledOrder note;
+  note.OrderId = orderId;
+  note.EDIDocId = Document().EDIDocId;
+  note.FileName = FileSystem().FullName(queue_.Path());
+  return note;
+}
+
+void OrderImporter::ForgetUnlisted() {
+  const auto notes = Try([&] { return Select(Records(), UnsettledOrder::kByFileName, NoteOf(0)); });
+  if (notes.empty()) return;
+  std::set<std::string> listed;
+  for (const ListedOrder& entry : listed_) listed.insert(entry.PONo + '\0' + entry.Controls());
+  for (const auto& note : notes) {
+    Order order;
+    order.OrderId = note->OrderId;
+    const bool stored = Try([&] { return partnerkit::Load(Records(), order); });
+    if (stored && listed.contains(order.PONo + '\0' + ControlsOf(order))) continue;
+    Try([&] { partnerkit::Delete(Records(), *note); });
+  }
+}
+
+void OrderImporter::ForgetUnsettled() {
+  Try([&] {
+    for (const std::int32_t orderId : unsettled_) {
+      UnsettledOrder note;
+      note.OrderId = orderId;
+      partnerkit::Delete(Records(), note);
+    }
+    if (!unsettled_.empty()) Host().Commit(0);
+  });
+  unsettled_.clear();
+}
+
+void OrderImporter::NoteBackedUp(const std::vector<std::int32_t>& orders) {
+  for (const std::int32_t orderId : orders) {
+    UnsettledOrder note;
+    note.OrderId = orderId;
+    if (!partnerkit::Load(Records(), note)) continue;
+    note.BackedUp = true;
+    if (!Update(Records(), note)) {
+      throw RunTimeError(run_time::kDatabase, "An order cannot be noted as backed up");
+    }
+  }
+  if (!orders.empty()) Host().Commit(0);
+}
+
+double OrderImporter::ReadNumber(OrderPosting& posting, std::string_view text, std::string_view place,
+                                 std::string_view name, bool isQuantity) {
+  const auto said = [&] {
+    constexpr std::size_t kShown = 60;
+    return std::string(place).append(": ").append(name).append(" \"").append(text.substr(0, kShown)).append("\" ");
+  };
+  double value = 0;
+  try {
+    value = NumberAtStart(text);
+  } catch (const RunTimeError&) {
+    throw Unreadable{said() + "is beyond all numbers"};
+  }
+  const bool odd = !text.empty() && !DecimalOf(text);
+  if ((odd || (isQuantity && value < 0)) && posting.warned.insert(std::string(place).append(" ").append(name)).second) {
+    posting.log.Note(kWarning, "PO " + posting.entry.PONo + ", " + said() +
+                                   (odd ? "is not a number; it is read as " + NumberText(value) + "."
+                                        : std::string("is a negative quantity.")));
+  }
+  return value;
+}
+
+void OrderImporter::Refuse(OrderPosting& posting, const Unreadable& fault) {
+  posting.entry.OrderId = 0;
+  posting.log.Note(kRejection,
+                   "...Cannot process PO " + posting.entry.PONo + ", " + fault.why + ". It stays in the file.");
+  posting.log.Note(kInformation, words::kImportIncomplete.With(posting.entry.PONo));
+}
+
+void OrderImporter::WarnOfNoNumber(OrderPosting& posting, std::string_view place) {
+  if (posting.entry.PONo.empty()) posting.log.Note(kWarning, "The order of " + std::string(place) + " has no number.");
 }
 
 OrderImporter::Next OrderImporter::SettleStoredOrder(OrderPosting& posting, OrderFacts facts,
@@ -104,6 +185,7 @@ OrderImporter::Next OrderImporter::SettleStoredOrder(OrderPosting& posting, Orde
   // The same transaction again. One that an earlier run left half stored is no order yet: it is replaced, for turned
   // away it would be neither in the store nor in the file. One stored with its faults looks like it, and is an order.
   if (SameTransaction(stored, posting.entry)) {
+    if (IsStoredEarlier(posting, stored)) return Next::kEnd;
     if (facts.incomplete && !posting.checks.FaultsPass()) {
       return CarryOut(posting, {.number = kWarning, .message = words::kIncomplete, .fate = Fate::kReplace}, facts,
                       stored);
@@ -115,6 +197,19 @@ OrderImporter::Next OrderImporter::SettleStoredOrder(OrderPosting& posting, Orde
   facts.hasJobs = HasJobs(stored);
   const OrderRule* const rule = FirstFitting(rules, facts);
   return rule == nullptr ? Next::kEnd : CarryOut(posting, *rule, facts, stored);
+}
+
+// A run that stored the order and was stopped before the file was settled: its lines go where those of a posted order
+// do.
+bool OrderImporter::IsStoredEarlier(OrderPosting& posting, const Order& stored) {
+  UnsettledOrder note;
+  note.OrderId = stored.OrderId;
+  if (!Try([&] { return partnerkit::Load(Records(), note); })) return false;
+  posting.log.Note(kRejection, words::kAlreadyExists.With(posting.entry.PONo));
+  posting.entry.OrderId = note.BackedUp ? 0 : stored.OrderId;
+  unsettled_.push_back(stored.OrderId);
+  MarkPosted(posting.entry);
+  return true;
 }
 
 bool OrderImporter::SameTransaction(const Order& stored, const ListedOrder& entry) const {
@@ -140,8 +235,7 @@ OrderImporter::Next OrderImporter::CarryOut(OrderPosting& posting, const OrderRu
     case Fate::kGoOn:
       return Next::kEnd;
     case Fate::kReplace:
-      if (!deleted()) return Next::kEnd;
-      Forget(stored);
+      posting.replaces = stored;
       return Next::kGoOn;
     case Fate::kCancel:
       deleted();
@@ -173,6 +267,14 @@ OrderImporter::Next OrderImporter::TurnAway(OrderPosting& posting) {
   return Next::kEnd;
 }
 
+bool OrderImporter::DeleteReplaced(OrderPosting& posting) {
+  if (!posting.replaces) return true;
+  if (!DeleteStored(*posting.replaces)) return false;
+  Forget(*posting.replaces);
+  posting.replaces.reset();
+  return posting.deletedStored = true;
+}
+
 bool OrderImporter::MakeDurable() {
   return Try([&] { Host().Commit(0); });
 }
@@ -195,8 +297,15 @@ bool OrderImporter::HasJobs(const Order& stored) {
 OrderImporter::Next OrderImporter::RefuseNewOrder(OrderPosting& posting, const OrderFacts& facts,
                                                   std::span<const OrderRule> rules) {
   while (const OrderRule* const rule = FirstFitting(rules, facts)) {
+    if (rule->fate == Fate::kCancel && !DeleteReplaced(posting)) return Next::kEnd;
     posting.log.Note(rule->number, rule->message.With(rule->fileNumber ? facts.fileNumber : posting.entry.PONo));
-    if (rule->fate != Fate::kGoOn) return rule->fate == Fate::kTurnAway ? TurnAway(posting) : Next::kEnd;
+    if (rule->fate == Fate::kTurnAway || rule->fate == Fate::kCancel) {
+      // A cancellation must not overtake its order, which a later run may store.
+      const bool refersToAnother = !rule->purpose.empty() || !rule->response.empty();
+      const bool waits = refersToAnother && !posting.deletedStored && EarlierStays(posting.entry);
+      return waits ? Next::kEnd : TurnAway(posting);
+    }
+    if (rule->fate != Fate::kGoOn) return Next::kEnd;
     rules = rules.subspan(static_cast<std::size_t>(rule - rules.data()) + 1);
   }
   return Next::kGoOn;
@@ -242,10 +351,13 @@ std::int32_t OrderImporter::Store(OrderPosting& posting, std::optional<std::stri
     return 0;
   }
   entry.OrderId = 0;
+  if (!DeleteReplaced(posting)) return 0;
   if (!StoreDraft(*this, posting.log, posting.draft, lineSequence)) return 0;
   const bool complete = !posting.checks.PassedWithErrors();
-  if (!orders::MakeDurable(*this, posting.draft, complete)) return 0;
+  UnsettledOrder note = NoteOf(posting.draft.header.OrderId);
+  if (!orders::MakeDurable(*this, posting.draft, complete, note)) return 0;
   entry.OrderId = posting.draft.header.OrderId;
+  unsettled_.push_back(entry.OrderId);
   MarkPosted(entry);
   Export(posting);
   posting.log.Note(kInformation, (complete ? words::kImportCompleted : words::kImportWithErrors).With(entry.PONo));

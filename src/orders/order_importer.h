@@ -3,6 +3,7 @@
 #pragma once
 
 #include <optional>
+#include <set>
 #include <span>
 #include <string>
 #include <string_view>
@@ -16,8 +17,14 @@
 
 namespace partnerkit::orders {
 
-// Segments that a transaction taken out of a file leaves behind.
-bool IsEnvelopeSegment(std::string_view text);
+// What an order file says that no order can be made of: a number beyond all bounds, an element that isn't there. The
+// order is turned away, with these words on the log, and stays in the file.
+struct Unreadable {
+  std::string why;  // "line 17: ..."
+};
+
+// The text with a small first letter.
+std::string AsPartOfSentence(std::string text);
 
 class OrderImporter : public TranslatorBase {
  protected:
@@ -32,10 +39,12 @@ class OrderImporter : public TranslatorBase {
     CallLog log;
     OrderDraft draft;
     OrderChecks checks;
-    bool deletedStored = false;  // an order stored under the number, for this one
-    bool complete = true;        // the transaction was read to its end
-    std::int32_t result = 0;     // what the call gives when it ends before storing
-    std::string shipTo;          // current ship-to and buying location
+    std::optional<Order> replaces;  // the order stored under the number that goes when this one is stored
+    bool deletedStored = false;     // it is gone
+    std::set<std::string> warned;   // places of values that were warned of
+    bool complete = true;           // the transaction was read to its end
+    std::int32_t result = 0;        // what the call gives when it ends before storing
+    std::string shipTo;             // current ship-to and buying location
     std::string buyingLocn;
     std::string locationLookedAt;
   };
@@ -57,6 +66,39 @@ class OrderImporter : public TranslatorBase {
   std::optional<std::uint64_t> EndOf(const ListedOrder& entry);
   // A file that holds nothing goes when the document definition asks for it.
   void DeleteWhenEmpty(bool optionAnywhere = false);
+  // Carries out the last step of a rewrite. False, and the user is told, when it fails.
+  template <class F>
+  bool PutInPlace(F step) {
+    try {
+      step();
+      return true;
+    } catch (const RunTimeError& error) {
+      Tell(Told::kFailed, error.Description());
+      return false;
+    }
+  }
+  WorkQueue::Rewrite::Tell TellOfRewrite() {
+    return [this](const std::string& sentence) { Tell(Told::kDone, sentence); };
+  }
+
+  // --- Orders that are stored while the file still holds them, see UnsettledOrder
+  // Behind listing: drops records of orders that have left the file since.
+  void ForgetUnlisted();
+  // Behind settling: the file holds them no longer.
+  void ForgetUnsettled();
+  // The backup has the lines of these.
+  void NoteBackedUp(const std::vector<std::int32_t>& orders);
+
+  // --- Values of lines and segments
+  // The number at the front of `text`, which `place` gives as `name` ("line 17", "ORDERQUANTITY"). One that isn't a
+  // number as a whole is read as far as it is one, and warned of; so is a negative quantity. Raises Unreadable for one
+  // beyond all bounds.
+  double ReadNumber(OrderPosting& posting, std::string_view text, std::string_view place, std::string_view name,
+                    bool isQuantity = false);
+  // Tells why the order cannot be read.
+  static void Refuse(OrderPosting& posting, const Unreadable& fault);
+  // The order has no number, which some partners' translators let pass.
+  static void WarnOfNoNumber(OrderPosting& posting, std::string_view place);
 
   // --- An order already stored
   // An order under the entry's number: the same transaction again is turned away, and of the rules the first that fits
@@ -69,6 +111,11 @@ class OrderImporter : public TranslatorBase {
   virtual bool SameTransaction(const Order& stored, const ListedOrder& entry) const;
   // The order needs no further work without being stored.
   Next TurnAway(OrderPosting& posting);
+  // Deletes the stored order that this one replaces, if there is one. False when the host refuses.
+  bool DeleteReplaced(OrderPosting& posting);
+  // An earlier transaction of the same number stays in the file, so that this one, which refers to it, has to stay,
+  // too.
+  virtual bool EarlierStays(const ListedOrder&) { return false; }
   virtual void MarkTurnedAway(ListedOrder& entry) = 0;
   // The order is stored no longer: what is known of it as dealt with is so no more.
   virtual void Forget(const Order&) {}
@@ -98,8 +145,11 @@ class OrderImporter : public TranslatorBase {
   WorkQueue queue_;
   std::string fileName_;
   std::vector<ListedOrder> listed_;
+  std::vector<std::int32_t> unsettled_;  // orders of this file whose records ForgetUnsettled drops
 
  private:
+  bool IsStoredEarlier(OrderPosting& posting, const Order& stored);
+  UnsettledOrder NoteOf(std::int32_t orderId);
   Next CarryOut(OrderPosting& posting, const OrderRule& rule, const OrderFacts& facts, Order& stored);
   bool DeleteStored(const Order& stored);
   bool HasJobs(const Order& stored);

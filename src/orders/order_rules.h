@@ -25,8 +25,10 @@ enum class Version {
 enum class Fate {
   kTurnAway,     // the order is done with and leaves the file
   kLeaveInFile,  // the call ends, the order stays in the file
-  kReplace,      // the stored order is deleted and the new one posted; a refused deletion leaves the order in the file
-  kCancel,       // the stored order is deleted, if the host agrees, and the new one leaves the file
+  kReplace,      // the new order is posted, and only when it has passed all checks the stored one deleted for it; a
+                 // refused deletion leaves the order in the file
+  kCancel,  // the stored order is deleted, if the host agrees, and the new one leaves the file; of a new order: one
+            // that was to be replaced by it is deleted
   kCancelIfDeleted,  // the same, but a refused deletion leaves the order in the file
   kCancelInFile,     // the stored order is deleted, if the host agrees, and the new one stays in the file
   kCancelThenSay,    // the stored order is deleted, and only then the message noted; the call gives the order's id, and

@@ -78,14 +78,20 @@ bool StoreDraft(TranslatorBase& translator, CallLog& log, OrderDraft& draft,
   return storing.Header() && storing.Lines() && storing.Locations() && storing.LocationLines();
 }
 
-bool MakeDurable(TranslatorBase& translator, OrderDraft& draft, bool complete) {
+bool MakeDurable(TranslatorBase& translator, OrderDraft& draft, bool complete, UnsettledOrder& note) {
   const auto markComplete = [&] {
     draft.header.Status = 0;
     if (!Update(translator.Records(), draft.header)) {
       throw RunTimeError(run_time::kDatabase, "PO " + draft.header.PONo + " cannot be marked complete");
     }
   };
+  const auto noteUnsettled = [&] {
+    if (!Add(translator.Records(), note)) {
+      throw RunTimeError(run_time::kDatabase, "PO " + draft.header.PONo + " cannot be noted as not settled");
+    }
+  };
   if (complete && !translator.Try(markComplete)) return false;
+  if (!translator.Try(noteUnsettled)) return false;
   return translator.Try([&] { translator.Host().Commit(0); });
 }
 

@@ -18,8 +18,8 @@ inline constexpr std::int32_t kBeingStored = 9;  // Order.Status of an order tha
 bool StoreDraft(TranslatorBase& translator, CallLog& log, OrderDraft& draft,
                 std::optional<std::string_view> lineSequence = {});
 
-// Makes the stored order durable, marked complete unless its faults are still to be settled. False, with the failure
-// reported, when it could not be.
-bool MakeDurable(TranslatorBase& translator, OrderDraft& draft, bool complete);
+// Makes the stored order durable, marked complete unless its faults are still to be settled, and the note that its file
+// still holds it. False, with the failure reported, when it could not be.
+bool MakeDurable(TranslatorBase& translator, OrderDraft& draft, bool complete, UnsettledOrder& note);
 
 }  // namespace partnerkit::orders

@@ -153,8 +153,11 @@ bool ImportProduct(TranslatorBase& translator) {
     // The file goes only once the store holds what it said.
     if (!translator.Try([&] { translator.Host().Commit(0); })) return;
     file.reset();
-    const HandlerOff off(translator.Errors());
-    translator.Try([&] { files.Delete(path); });
+    try {
+      files.Delete(path);
+    } catch (const RunTimeError& error) {
+      translator.Tell(Told::kFailed, "The product file is read, and will be read again: " + error.Description());
+    }
     imported = true;
   });
 }

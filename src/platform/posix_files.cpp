@@ -1,7 +1,6 @@
 #include "platform/posix_files.h"
 
 #include <fcntl.h>
-#include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -15,6 +14,7 @@
 #include <utility>
 
 #include "platform/posix_calls.h"
+#include "platform/posix_opening.h"
 
 namespace partnerkit::platform {
 
@@ -28,98 +28,10 @@ constexpr std::size_t kWriteBuffer = 256 * 1024;
 // After so many bytes the disk is set to work, so that a later Sync finds most of it done.
 constexpr std::uint64_t kWriteBehind = 8 * 1024 * 1024;
 
-// How often a file that is replaced while it is being opened is tried again.
-constexpr int kOpenAttempts = 5;
-
 // The native form of a path that a call of the system may be given.
 std::string Checked(const std::string& path) {
   if (path.find('\0') != std::string::npos) Raise(run_time::kBadFileName, path, "A name cannot hold a NUL byte");
   return NativePath(path);
-}
-
-struct stat StatusOf(int descriptor, const std::string& native) {
-  struct stat status {};
-  if (fstat(descriptor, &status) != 0) RaiseCause(errno, native, run_time::kDeviceError);
-  return status;
-}
-
-// Whether a file has that name, and is the one held.
-bool FileIs(const std::string& native, const struct stat& held) {
-  struct stat named {};
-  return stat(native.c_str(), &named) == 0 && named.st_dev == held.st_dev && named.st_ino == held.st_ino;
-}
-
-bool Names(const std::string& native, const struct stat& held) {
-  if (FileIs(native, held)) return true;
-  struct stat named {};
-  if (stat(native.c_str(), &named) == 0 || errno == ENOENT || errno == ENOTDIR) return false;
-  RaiseCause(errno, native, run_time::kPathAccess);
-}
-
-bool LocksUnknown(int cause) { return cause == ENOLCK || cause == ENOSYS || cause == EOPNOTSUPP || cause == EINVAL; }
-
-// Takes both kinds of lock. A file system may know one kind only, which then has to do.
-void Hold(int descriptor, bool exclusive, bool writable, const std::string& native) {
-  int failures = 0;
-  const auto judge = [&](int result) {
-    if (result == 0) return;
-    if (errno == EWOULDBLOCK || errno == EACCES) {
-      Raise(run_time::kPermissionDenied, native, "The file is in use");
-    }
-    if (!LocksUnknown(errno) || ++failures == 2) RaiseCause(errno, native, run_time::kPathAccess);
-  };
-  judge(Uninterrupted([&] { return flock(descriptor, (exclusive ? LOCK_EX : LOCK_SH) | LOCK_NB); }));
-  struct flock wholeFile {};
-  // A write lock is refused on a descriptor that cannot write; a read lock then still turns writers away.
-  wholeFile.l_type = exclusive && writable ? F_WRLCK : F_RDLCK;
-  wholeFile.l_whence = SEEK_SET;
-  judge(Uninterrupted([&] { return fcntl(descriptor, F_OFD_SETLK, &wholeFile); }));
-}
-
-struct Opened {
-  Descriptor descriptor;
-  bool writable;
-};
-
-// Gives what `open` opens, held, once the name still means that file. A file that was replaced between the two would be
-// held by nobody who looks for it.
-template <class F>
-std::pair<Descriptor, struct stat> OpenHeld(const std::string& native, bool exclusive, F open) {
-  for (int attempt = 0; attempt < kOpenAttempts; ++attempt) {
-    Opened opened = open();
-    const struct stat status = StatusOf(opened.descriptor.Number(), native);
-    if (S_ISDIR(status.st_mode)) RaiseCause(EISDIR, native, run_time::kPathAccess);
-    Hold(opened.descriptor.Number(), exclusive, opened.writable, native);
-    if (Names(native, status)) return {std::move(opened.descriptor), status};
-  }
-  Raise(run_time::kPermissionDenied, native, "Another program keeps replacing the file");
-}
-
-// Without O_NONBLOCK the opening of a pipe would wait for its other end. Regular files don't heed it.
-constexpr int kOpenFlags = O_CLOEXEC | O_NOCTTY | O_NONBLOCK;
-
-Opened OpenToRead(const std::string& native, bool preferWritable) {
-  const auto open = [&](int access) {
-    return Descriptor(Uninterrupted([&] { return ::open(native.c_str(), access | kOpenFlags); }));
-  };
-  if (preferWritable) {
-    Descriptor writable = open(O_RDWR);
-    if (writable.IsOpen()) return {std::move(writable), true};
-    if (errno != EACCES && errno != EPERM && errno != EROFS && errno != ETXTBSY) {
-      RaiseCause(errno, native, run_time::kPathAccess);
-    }
-  }
-  Descriptor readable = open(O_RDONLY);
-  if (!readable.IsOpen()) RaiseCause(errno, native, run_time::kPathAccess);
-  return {std::move(readable), false};
-}
-
-Opened OpenToWrite(const std::string& native) {
-  // No O_TRUNC: another program's file must not be emptied before it is known to be free.
-  Descriptor opened(
-      Uninterrupted([&] { return ::open(native.c_str(), O_WRONLY | O_CREAT | O_APPEND | kOpenFlags, 0666); }));
-  if (!opened.IsOpen()) RaiseCause(errno, native, run_time::kPathAccess);
-  return {std::move(opened), true};
 }
 
 // A folder open for making its names durable. One that may be written but not read cannot be opened.
@@ -215,6 +127,11 @@ class PosixInput : public InputFile {
     return Names(Checked(path), StatusOf(descriptor_.Number(), native_));
   }
 
+  FileRights Rights() override {
+    const struct stat status = StatusOf(descriptor_.Number(), native_);
+    return {true, status.st_mode & 07777, status.st_uid, status.st_gid};
+  }
+
   // The file's number alone would not do: it goes to the next file made once this one is deleted. The device's number
   // may change with a restart. Where the file system keeps no time of birth, the file's number has to do.
   std::string Identity() override {
@@ -285,9 +202,37 @@ class PosixOutput : public OutputFile {
     if (failure != 0) RaiseCause(failure, native_, run_time::kDeviceError);
   }
 
+  bool TakeRights(const FileRights& rights, Take what) override {
+    CheckOpen();
+    if (!rights.known) return true;
+    const int number = descriptor_.Number();
+    const struct stat own = StatusOf(number, native_);
+    if (what == Take::kNoMore) {
+      constexpr std::uint32_t kOthers = S_IRWXG | S_IRWXO;
+      SetMode(own.st_mode & 07777 & (~kOthers | rights.mode));
+      return true;
+    }
+    bool taken = true;
+    std::uint32_t mode = rights.mode;
+    if (what == Take::kAll && fchown(number, static_cast<uid_t>(-1), rights.group) != 0) {
+      // It would be another group that gets the rights.
+      mode &= ~static_cast<std::uint32_t>(S_IRWXG);
+      taken = false;
+    }
+    if (what == Take::kAll && own.st_uid != rights.owner) {
+      taken = fchown(number, rights.owner, static_cast<gid_t>(-1)) == 0 && taken;
+    }
+    SetMode(mode);
+    return taken;
+  }
+
  private:
   void CheckOpen() const {
     if (!descriptor_.IsOpen()) Raise(run_time::kBadFileName, native_, "The file is closed");
+  }
+
+  void SetMode(std::uint32_t mode) const {
+    if (fchmod(descriptor_.Number(), mode) != 0) RaiseCause(errno, native_, run_time::kPathAccess);
   }
 
   // What could not be written stays in the buffer.
@@ -359,10 +304,18 @@ std::string PosixFiles::FullName(const std::string& path) {
   return failure ? native : full.string();
 }
 
+std::string PosixFiles::Resolved(const std::string& path) {
+  std::error_code failure;
+  const std::string native = NativePath(path);
+  if (!std::filesystem::is_symlink(native, failure)) return path;
+  const std::filesystem::path target = std::filesystem::canonical(native, failure);
+  return failure ? path : target.string();
+}
+
 std::unique_ptr<InputFile> PosixFiles::OpenInput(const std::string& path, Share share) {
   std::string native = Checked(path);
   const bool exclusive = share == Share::kExclusive;
-  auto [descriptor, status] = OpenHeld(native, exclusive, [&] { return OpenToRead(native, exclusive); });
+  auto [descriptor, status] = OpenInputHeld(native, exclusive);
   if (!S_ISREG(status.st_mode)) Raise(run_time::kPathAccess, native, "Not a file whose bytes can be addressed");
   // A hint only: a file system that ignores it reads as well.
   static_cast<void>(posix_fadvise(descriptor.Number(), 0, 0, POSIX_FADV_SEQUENTIAL));
@@ -371,19 +324,25 @@ std::unique_ptr<InputFile> PosixFiles::OpenInput(const std::string& path, Share 
 
 std::unique_ptr<OutputFile> PosixFiles::OpenOutput(const std::string& path, OutputMode mode) {
   std::string native = Checked(path);
-  auto [descriptor, status] = OpenHeld(native, true, [&] { return OpenToWrite(native); });
+  auto [descriptor, status] = OpenOutputHeld(native, mode != OutputMode::kAppendOwn);
   const int number = descriptor.Number();
   std::uint64_t length = 0;
   if (!S_ISREG(status.st_mode)) {
     // A device takes bytes at its own speed.
     fcntl(number, F_SETFL, O_APPEND);
-  } else if (mode == OutputMode::kAppend) {
+  } else if (mode != OutputMode::kReplace) {
     // Measured under the hold: the file may have grown since it was opened.
     length = static_cast<std::uint64_t>(StatusOf(number, native).st_size);
   } else if (Uninterrupted([number] { return ftruncate(number, 0); }) != 0) {
     RaiseCause(errno, native, run_time::kPathAccess);
   }
   return std::make_unique<PosixOutput>(std::move(descriptor), std::move(native), length);
+}
+
+std::unique_ptr<OutputFile> PosixFiles::OpenDraft(const std::string& path, std::string& name) {
+  Draft draft = MakeDraft(Checked(path));
+  name = draft.name;
+  return std::make_unique<PosixOutput>(std::move(draft.descriptor), std::move(draft.name), 0);
 }
 
 void PosixFiles::Delete(const std::string& path) {
@@ -407,20 +366,19 @@ void PosixFiles::CreateFolder(const std::string& path) {
 }
 
 void PosixFiles::Copy(const std::string& from, const std::string& to) {
-  const std::string source = Checked(from), target = Checked(to), draft = target + ".tmp";
-  const Descriptor in(Uninterrupted([&] { return ::open(source.c_str(), O_RDONLY | kOpenFlags); }));
+  const std::string source = Checked(from), target = Checked(to);
+  const Descriptor in = OpenWith(source, O_RDONLY);
   if (!in.IsOpen()) RaiseCause(errno, source, run_time::kPathAccess);
   const struct stat status = StatusOf(in.Number(), source);
   if (!S_ISREG(status.st_mode)) RaiseCause(EISDIR, source, run_time::kPathAccess);
   if (FileIs(target, status)) Raise(run_time::kPathAccess, target, "A file cannot be copied onto itself");
-  Descriptor out(Uninterrupted(
-      [&] { return ::open(draft.c_str(), O_WRONLY | O_CREAT | O_TRUNC | kOpenFlags, status.st_mode & 0777); }));
-  if (!out.IsOpen()) RaiseCause(errno, draft, run_time::kPathAccess);
-  int failure = CopyBytes(in.Number(), out.Number());
-  if (const int cause = out.Close(); failure == 0) failure = cause;
-  if (failure == 0 && std::rename(draft.c_str(), target.c_str()) != 0) failure = errno;
+  Draft draft = MakeDraft(target);
+  const int out = draft.descriptor.Number();
+  int failure = fchmod(out, status.st_mode & 0777) == 0 ? CopyBytes(in.Number(), out) : errno;
+  if (failure == 0 && std::rename(draft.name.c_str(), target.c_str()) != 0) failure = errno;
+  if (const int cause = draft.descriptor.Close(); failure == 0) failure = cause;
   if (failure == 0) return;
-  ::unlink(draft.c_str());
+  ::unlink(draft.name.c_str());
   RaiseCause(failure, target, run_time::kDeviceError);
 }
 

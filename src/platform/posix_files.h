@@ -21,15 +21,17 @@ class PosixFiles : public Files {
   // True for anything but a folder.
   bool Exists(const std::string& path) override;
   std::string FullName(const std::string& path) override;
+  std::string Resolved(const std::string& path) override;
   std::unique_ptr<InputFile> OpenInput(const std::string& path, Share share) override;
   std::unique_ptr<OutputFile> OpenOutput(const std::string& path, OutputMode mode) override;
+  // ".orders.csv.partnerkit-1", or a higher number while other programs hold the lower ones.
+  std::unique_ptr<OutputFile> OpenDraft(const std::string& path, std::string& name) override;
   // Removes the name also while a program holds the file.
   void Delete(const std::string& path) override;
   void Rename(const std::string& from, const std::string& to) override;
-  // As Rename, but never in the place of a file: false, and nothing done, when one has the name `to`.
-  bool RenameNew(const std::string& from, const std::string& to);
+  bool RenameNew(const std::string& from, const std::string& to) override;
   void CreateFolder(const std::string& path) override;
-  // By way of the name `to` and ".tmp". The copy isn't brought to the disk at once.
+  // By way of a draft. The copy isn't brought to the disk at once.
   void Copy(const std::string& from, const std::string& to) override;
 };
 

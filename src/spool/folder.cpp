@@ -21,7 +21,6 @@ using platform::Descriptor, platform::RaiseCause, platform::Uninterrupted;
 
 namespace {
 
-constexpr std::string_view kDraftPrefix = ".partnerkit-", kDraftSuffix = ".draft";
 // Far above any number that counting reaches, so that a stray file's name cannot exhaust them.
 constexpr std::size_t kMostDigits = 15;
 
@@ -36,7 +35,7 @@ class HeldFolder {
     }
     if (!folder_.IsOpen()) RaiseCause(errno, path, run_time::kPathAccess);
     const auto deadline = std::chrono::steady_clock::now() + patience;
-    while (!(locked_ = Uninterrupted([&] { return flock(folder_.Number(), LOCK_EX | LOCK_NB); }) == 0)) {
+    while (Uninterrupted([&] { return flock(folder_.Number(), LOCK_EX | LOCK_NB); }) != 0) {
       if (errno != EWOULDBLOCK) return;
       if (std::chrono::steady_clock::now() > deadline) {
         platform::Raise(run_time::kPermissionDenied, path,
@@ -53,14 +52,13 @@ class HeldFolder {
     return {state.st_mtim.tv_sec, state.st_mtim.tv_nsec};
   }
 
-  // The highest number of a job; 0 when there is none. Takes away drafts that killed programs left.
+  // The highest number of a job; 0 when there is none.
   std::uint64_t LastNumber() const {
     std::uint64_t last = 0;
     std::error_code failure;
     for (fs::directory_iterator file(path_, failure), end; !failure && file != end; file.increment(failure)) {
       const std::string name = file->path().filename().string();
       last = std::max(last, NumberOf(name));
-      if (locked_ && name.starts_with(kDraftPrefix) && name.ends_with(kDraftSuffix)) unlink(file->path().c_str());
     }
     if (failure) RaiseCause(failure.value(), path_, run_time::kPathAccess);
     return last;
@@ -77,7 +75,6 @@ class HeldFolder {
 
   std::string path_;
   Descriptor folder_;
-  bool locked_ = false;
 };
 
 std::string FileName(std::uint64_t number, Content content) {
@@ -95,16 +92,15 @@ class FolderDestination : public Destination {
     const HeldFolder held(folder_, timeOuts_.stall);
     // Looking through the folder for each job would make a thousand of them cost a million.
     std::uint64_t number = last_ && last_->changed == held.Changed() ? last_->number : held.LastNumber();
-    const std::string draft =
-        InFolder(std::string(kDraftPrefix) + std::to_string(getpid()) + std::string(kDraftSuffix));
+    std::string draft;
+    const std::unique_ptr<OutputFile> file = files_.OpenDraft(InFolder("job"), draft);
     try {
-      const std::unique_ptr<OutputFile> file = files_.OpenOutput(draft, OutputMode::kReplace);
       file->Write(bytes);
       file->Sync();
-      file->Close();
       std::string name;
       do name = InFolder(FileName(++number, content));
       while (!files_.RenameNew(draft, name));
+      file->Close();
       last_ = {held.Changed(), number};
       return name;
     } catch (...) {

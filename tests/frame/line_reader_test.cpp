@@ -88,6 +88,32 @@ TEST_F(LineReaderTest, ReadsALineLargerThanEveryBlock) {
   EXPECT_EQ(lines, (std::vector<std::pair<std::uint64_t, std::size_t>>{{1, 1}, {3, 10'000'000}, {10'000'005, 1}}));
 }
 
+TEST_F(LineReaderTest, EndsAtCtrlZAndKnowsALineWithoutAnEnd) {
+  const struct {
+    std::string bytes, lines;
+    std::uint64_t position;
+  } cases[] = {
+      {"a\nb", "a b?", 4},
+      {"a\nb\x1A", "a b", 4},
+      {"a\nb\r\n\x1A\x1A", "a b", 6},
+      {"a\x1A\n\x1A"
+       "b\n",
+       "a\x1A b", 7},
+      {"\x1A", "", 1},
+  };
+  for (const auto& c : cases) {
+    for (const std::size_t block : {1, 3, 100}) {
+      LineReader reader(File(c.bytes), block);
+      std::string lines;
+      for (Line line; reader.Read(line);) {
+        lines.append(lines.empty() ? "" : " ").append(line.text).append(line.ended ? "" : "?");
+      }
+      EXPECT_EQ(lines, c.lines);
+      EXPECT_EQ(reader.Position(), c.position);
+    }
+  }
+}
+
 // Takes minutes when each line is searched for beyond its own end.
 TEST_F(LineReaderTest, ReadsAFileOfLoneCarriageReturnsInOnePass) {
   std::string bytes;

@@ -90,8 +90,8 @@ void CheckAll() {
 
 TEST(RecordTypes, ReachEveryMemberOfARecordOnce) {
   CheckAll<Partner, Vendor, EDIDoc, PartnerAddress, PartnerLocn, Product, ProductPrice, ProductInner, Prepack, PackType,
-           Printer, LabelJob, LabelJobItem, Order, OrderLine, OrderLocn, OrderLocnLine, Job, PSlip, PSlipLine, Shipment,
-           ASN, PendingNotice, Pack, PackLine, PADRecord, PADItem, PADStore, Log>();
+           Printer, LabelJob, LabelJobItem, Order, OrderLine, OrderLocn, OrderLocnLine, UnsettledOrder, Job, PSlip,
+           PSlipLine, Shipment, ASN, PendingNotice, Pack, PackLine, PADRecord, PADItem, PADStore, Log>();
 }
 
 }  // namespace

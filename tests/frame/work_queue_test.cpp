@@ -4,6 +4,10 @@
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
 
 #include "platform/posix_files.h"
 #include "support/error_of.h"
@@ -21,7 +25,10 @@ TEST(TemporaryNameTest, TakesTheLastExtensionsPlace) {
   EXPECT_EQ(TemporaryName("orders.tmp"), "orders.tmp.tmp");
 }
 
+using ::testing::ElementsAre;
 using testing::ErrorOf;
+using ::testing::IsEmpty;
+using ::testing::SizeIs;
 using ::testing::StartsWith;
 
 class WorkQueueTest : public ::testing::Test {
@@ -32,7 +39,7 @@ class WorkQueueTest : public ::testing::Test {
   }
   // Keeps the lines that don't begin with "-", and what `finish` does is done before the rewrite is let go.
   void Deal(const std::function<void(WorkQueue::Rewrite&)>& finish) {
-    WorkQueue::Rewrite rewrite(queue_);
+    WorkQueue::Rewrite rewrite(queue_, Tell());
     rewrite.Begin();
     LineReader lines(queue_.File());
     for (Line line; lines.Read(line);) {
@@ -42,34 +49,126 @@ class WorkQueueTest : public ::testing::Test {
     finish(rewrite);
   }
 
+  WorkQueue::Rewrite::Tell Tell() {
+    return [this](const std::string& sentence) { told_.push_back(sentence); };
+  }
+  // The names in the folder, each with what the file holds: "orders.txt=a".
+  std::vector<std::string> Files() {
+    std::vector<std::string> all;
+    for (const auto& entry : std::filesystem::directory_iterator(folder_ / "")) {
+      const std::string name = entry.path().filename();
+      all.push_back(name + (entry.is_symlink() ? "->" : "=") + folder_.Read(name));
+    }
+    std::ranges::sort(all);
+    return all;
+  }
+
+  std::vector<std::string> told_;
   testing::TempFolder folder_;
   platform::PosixFiles posix_;
   testing::FaultyFiles files_{posix_};
   WorkQueue queue_{files_};
 };
 
+const auto kReplace = [](WorkQueue::Rewrite& rewrite) {
+  rewrite.Claim();
+  rewrite.Replace();
+};
+
 TEST_F(WorkQueueTest, KeepsWhatStaysByteForByte) {
-  folder_.Write("orders.tmp", "left by a run that died");
   Open("a \r\n-b\n\nc\r-d\r\n\"e,f");
   Deal([](WorkQueue::Rewrite&) {});
-  EXPECT_EQ(folder_.Read("orders.txt"), "a \r\n-b\n\nc\r-d\r\n\"e,f");
-  EXPECT_FALSE(folder_.Has("orders.tmp"));
-  Deal([](WorkQueue::Rewrite& rewrite) {
-    rewrite.Claim();
-    rewrite.Replace();
-  });
-  EXPECT_EQ(folder_.Read("orders.txt"), "a \r\n\nc\r\"e,f");
-  EXPECT_FALSE(folder_.Has("orders.tmp"));
-  Deal([](WorkQueue::Rewrite& rewrite) {
-    EXPECT_THAT(ErrorOf([&] { rewrite.Claim(); }), StartsWith("53 ")) << "another file took the name";
-  });
-  EXPECT_EQ(folder_.Read("orders.txt.kept"), "a \r\n\nc\r\"e,f");
+  EXPECT_THAT(Files(), ElementsAre("orders.txt=a \r\n-b\n\nc\r-d\r\n\"e,f"));
+  Deal(kReplace);
+  EXPECT_THAT(Files(), ElementsAre("orders.txt=a \r\n\nc\r\"e,f"));
+  for (const char* const kept : {"orders.txt.kept", "orders.txt.kept.1"}) {
+    Deal([](WorkQueue::Rewrite& rewrite) {
+      EXPECT_THAT(ErrorOf([&] { rewrite.Claim(); }), StartsWith("53 ")) << "another file took the name";
+    });
+    EXPECT_EQ(folder_.Read(kept), "a \r\n\nc\r\"e,f");
+  }
+  EXPECT_THAT(told_, IsEmpty());
+}
+
+// The temporary name is somebody else's until the order file cannot be replaced.
+TEST_F(WorkQueueTest, MovesFilesOfOthersAsideAndDeletesNone) {
+  const struct {
+    std::string what, temporary;
+    bool fails;
+    std::vector<std::string> files;
+    std::size_t told;
+  } cases[] = {
+      {"none", "", false, {"orders.tmp=", "orders.txt=a\n"}, 0},
+      {"an upload", "half of", false, {"orders.tmp.1=half of", "orders.txt=a\n"}, 1},
+      {"envelopes of nothing",
+       "ISA*0~GS*PO~\r\n\r\nST*850~ ~",
+       false,
+       {"orders.tmp=ISA*0~GS*PO~\r\n\r\nST*850~ ~", "orders.txt=a\n"},
+       0},
+      {"an upload, and it cannot be replaced",
+       "half of",
+       true,
+       {"orders.tmp.1=half of", "orders.tmp=a\n", "orders.txt=a\n-b"},
+       1},
+      {"nothing, and it cannot be replaced", "", true, {"orders.tmp.1=a\n", "orders.tmp=", "orders.txt=a\n-b"}, 0},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.what);
+    told_.clear();
+    for (const char* name : {"orders.tmp", "orders.tmp.1"}) std::filesystem::remove(folder_ / name);
+    folder_.Write("orders.tmp", c.temporary);
+    Open("a\n-b");
+    if (c.fails) files_.Fail("Rename", "orders.txt", 75);
+    Deal([&](WorkQueue::Rewrite& rewrite) {
+      rewrite.Claim();
+      EXPECT_THAT(ErrorOf([&] { rewrite.Replace(); }), StartsWith(c.fails ? "75 The file " : ""));
+    });
+    EXPECT_EQ(Files(), c.files);
+    EXPECT_THAT(told_, SizeIs(c.told));
+    queue_.Close();
+  }
+}
+
+TEST_F(WorkQueueTest, RewritesTheFileThatALinkLeadsTo) {
+  std::filesystem::create_directory(folder_ / "real");
+  folder_.Write("real/po.txt", "a\n-b");
+  std::filesystem::create_symlink("real/po.txt", folder_ / "orders.txt");
+  queue_.Open(folder_ / "orders.txt");
+  Deal(kReplace);
+  EXPECT_TRUE(std::filesystem::is_symlink(folder_ / "orders.txt"));
+  EXPECT_EQ(folder_.Read("real/po.txt"), "a\n");
+}
+
+// Of a mailbox's file, and of what is made of it.
+TEST_F(WorkQueueTest, KeepsOwnerGroupAndMode) {
+  Open("a\n-b");
+  const bool root = geteuid() == 0;
+  ASSERT_TRUE(!root || chown((folder_ / "orders.txt").c_str(), 1234, 4321) == 0);
+  ASSERT_EQ(chmod((folder_ / "orders.txt").c_str(), 0640), 0);
+  folder_.Write("old.txt", "old\n");
+  ASSERT_EQ(chmod((folder_ / "old.txt").c_str(), 0666), 0);
+  const auto status = [&](const char* name) {
+    struct stat status {};
+    EXPECT_EQ(stat((folder_ / name).c_str(), &status), 0);
+    return status;
+  };
+  for (const auto& [name, mode] : {std::pair("old.txt", 0640U), std::pair("new.txt", 0640U)}) {
+    BackupFile backup(files_);
+    backup.Open(folder_ / name);
+    backup.Append(queue_.File(), queue_.Path(), {{3, 5}});
+    backup.Settle();
+    EXPECT_EQ(status(name).st_mode & 0777, mode);
+  }
+  Deal(kReplace);
+  EXPECT_EQ(status("orders.txt").st_mode & 0777, 0640U);
+  EXPECT_TRUE(!root || (status("orders.txt").st_uid == 1234 && status("orders.txt").st_gid == 4321));
+  EXPECT_THAT(told_, IsEmpty());
 }
 
 TEST_F(WorkQueueTest, KeepsRangesAndRemovesAFinishedFile) {
   for (const bool withTemporary : {true, false}) {
     Open("a~b~" + std::string(300'000, 'c') + "~d");
-    WorkQueue::Rewrite rewrite(queue_);
+    WorkQueue::Rewrite rewrite(queue_, Tell());
     rewrite.Begin();
     rewrite.KeepRange({3, 300'006});
     rewrite.KeepRange({1, 1});
@@ -92,12 +191,18 @@ class BackupFileTest : public WorkQueueTest {
     folder_.Write("backup.txt", "old\r\n");
     backup.Open(folder_ / "backup.txt");
     Open("a\r\n-b\r\nc\r\n-d");
-    backup.Append(queue_.File(), queue_.Path(), {{4, 8}, {11, 13}});
+    backup.Append(queue_.File(), queue_.Path(), {{4, 8}, {11, 13}}, {7, 9});
   }
   std::string Reopen() {
     queue_.Close();
-    return ErrorOf([&] { BackupFile(files_).Open(folder_ / "backup.txt"); });
+    return ErrorOf([&] {
+      BackupFile backup(files_);
+      backup.Open(folder_ / "backup.txt");
+      finished_ = backup.Finished();
+      backup.Settle();
+    });
   }
+  std::vector<std::int32_t> finished_;
   // A run that died with the lines appended, or half of them, and the note still there.
   void DieAppending(std::size_t written) {
     {
@@ -155,6 +260,7 @@ TEST_F(BackupFileTest, FinishesWhatARunThatDiedHadNoted) {
     c.meanwhile();
     EXPECT_EQ(Reopen(), "");
     EXPECT_EQ(folder_.Read("backup.txt"), c.backup);
+    EXPECT_THAT(finished_, SizeIs(c.backup == kWhole ? 2 : 0));
     EXPECT_FALSE(folder_.Has("backup.txt.pending"));
   }
 }

@@ -54,7 +54,7 @@ TEST_F(SchemaTest, RefusesWhatIsNoStoreOfItsOwn) {
     return ErrorOf([&] { SqlHost::Open(url, {.create = create}); });
   };
   Open(7);
-  EXPECT_EQ(open(Path()), Path() + ": is of a newer version (7) than this program (1) understands");
+  EXPECT_EQ(open(Path()), Path() + ": is of a newer version (7) than this program (2) understands");
   EXPECT_EQ(Ask(Path(), "SELECT count(*) FROM sqlite_master WHERE name='tbOrder'"), "0");
   std::ofstream(Path("letter.txt")) << std::string(5000, 'x');
   EXPECT_EQ(open(Path("letter.txt")), Path("letter.txt") + ": file is not a database");

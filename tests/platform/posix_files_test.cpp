@@ -316,6 +316,62 @@ TEST_F(PosixFilesTest, CopiesIntoThePlaceOfAnOlderFile) {
   EXPECT_EQ(std::distance(std::filesystem::directory_iterator(Path("")), {}), 2);
 }
 
+// Under every name that somebody can guess.
+TEST_F(PosixFilesTest, MakesNoFileThroughALinkThatSomebodyHasPutThere) {
+  const std::string outside = Put("outside", "theirs"), orders = Put("orders.txt", "ours");
+  const auto plant = [&](const std::string& name, const std::string& target) {
+    std::filesystem::remove(Path(name));
+    std::filesystem::create_symlink(target, Path(name));
+  };
+  std::filesystem::create_directory(Path("archive"));
+  plant("archive/.orders.txt.partnerkit-1", outside);
+  plant("archive/orders.txt", outside);
+  files_.Copy(orders, Path("archive/orders.txt"));
+  EXPECT_EQ(Bytes(Path("archive/orders.txt")), "ours");
+  for (const std::string& target : {outside, Path("none")}) {
+    plant("ack.txt", target);
+    EXPECT_EQ(NumberOf([&] { files_.OpenOutput(Path("ack.txt"), OutputMode::kAppendOwn); }), 75) << target;
+  }
+  EXPECT_EQ(NumberOf([&] { files_.OpenOutput(Path("ack.txt"), OutputMode::kAppend); }), 75) << "leads nowhere";
+  EXPECT_FALSE(files_.Exists(Path("none")));
+  EXPECT_EQ(Bytes(outside), "theirs");
+}
+
+TEST_F(PosixFilesTest, GivesEachDraftANameOfItsOwn) {
+  const std::string path = Put("orders.txt", "orders");
+  std::string first, second, next;
+  auto held = files_.OpenDraft(path, first);
+  held->Write("of the first");
+  held->Close();
+  Put(".orders.txt.partnerkit-3", "left by a program that died");
+  EXPECT_EQ(InChild([&] {
+              held = files_.OpenDraft(path, first);
+              return files_.OpenDraft(path, second) != nullptr && second == Path(".orders.txt.partnerkit-2") ? 0 : 1;
+            }),
+            0);
+  EXPECT_EQ(first, Path(".orders.txt.partnerkit-1"));
+  // What the child left is nobody's now.
+  const auto again = files_.OpenDraft(path, first), another = files_.OpenDraft(path, second),
+             third = files_.OpenDraft(path, next);
+  EXPECT_EQ(first, Path(".orders.txt.partnerkit-1"));
+  EXPECT_EQ(next, Path(".orders.txt.partnerkit-3"));
+  EXPECT_EQ(again->Length() + third->Length(), 0U);
+  EXPECT_EQ(Bytes(next), "");
+  std::string ofLong;
+  EXPECT_NE(files_.OpenDraft(Path(std::string(250, 'n')), ofLong), nullptr);
+}
+
+TEST_F(PosixFilesTest, CopiesTheMode) {
+  const std::string from = Put("secret.txt", "s"), to = Path("copy.txt");
+  for (const mode_t mode : {0600U, 0666U}) {
+    ASSERT_EQ(chmod(from.c_str(), mode), 0);
+    files_.Copy(from, to);
+    struct stat status {};
+    ASSERT_EQ(stat(to.c_str(), &status), 0);
+    EXPECT_EQ(status.st_mode & 0777, mode);
+  }
+}
+
 TEST_F(PosixFilesTest, RenamesAnewButNeverInThePlaceOfAFile) {
   Put("taken.prn", "theirs");
   std::filesystem::create_directory(Path("folder.prn"));

@@ -13,8 +13,8 @@ class FaultyFiles : public Files {
  public:
   explicit FaultyFiles(Files& real) : real_(real) {}
 
-  // After `passed` good ones, the next `times` operations `what` ("Length", "OpenInput", "OpenOutput", "Delete",
-  // "Rename", "Copy", "Read", "Write", "Sync" or "Truncate") on a file whose path ends in `name` raise `number`.
+  // After `passed` good ones, the next `times` operations `what` ("Length", "OpenInput", "OpenOutput", "OpenDraft",
+  // "Delete", "Rename", "Copy", "Read", "Write", "Sync" or "Truncate") on a file whose path ends in `name` raise `number`.
   void Fail(std::string what, std::string name, std::int32_t number, int times = 1, int passed = 0) {
     fault_ = {std::move(what), std::move(name), number, times, passed};
   }
@@ -30,7 +30,16 @@ class FaultyFiles : public Files {
     Check("OpenOutput", path);
     return std::make_unique<Output>(*this, path, real_.OpenOutput(path, mode));
   }
+  // A draft fails under the name that it is a draft of.
+  std::unique_ptr<OutputFile> OpenDraft(const std::string& path, std::string& name) override {
+    Check("OpenDraft", path);
+    return std::make_unique<Output>(*this, path, real_.OpenDraft(path, name));
+  }
+  std::string Resolved(const std::string& path) override { return real_.Resolved(path); }
   void Delete(const std::string& path) override { Check("Delete", path), real_.Delete(path); }
+  bool RenameNew(const std::string& from, const std::string& to) override {
+    return Check("Rename", to), real_.RenameNew(from, to);
+  }
   void Rename(const std::string& from, const std::string& to) override { Check("Rename", to), real_.Rename(from, to); }
   void CreateFolder(const std::string& path) override { real_.CreateFolder(path); }
   void Copy(const std::string& from, const std::string& to) override { Check("Copy", to), real_.Copy(from, to); }
@@ -51,6 +60,7 @@ class FaultyFiles : public Files {
     std::uint64_t Length() override { return real->Length(); }
     bool StillNamed(const std::string& path) override { return real->StillNamed(path); }
     std::string Identity() override { return real->Identity(); }
+    FileRights Rights() override { return real->Rights(); }
 
     FaultyFiles& files;
     std::string name;
@@ -65,6 +75,7 @@ class FaultyFiles : public Files {
     std::uint64_t Length() override { return real->Length(); }
     void Truncate(std::uint64_t length) override { files.Check("Truncate", name), real->Truncate(length); }
     void Close() override { real->Close(); }
+    bool TakeRights(const FileRights& rights, Take what) override { return real->TakeRights(rights, what); }
 
     FaultyFiles& files;
     std::string name;

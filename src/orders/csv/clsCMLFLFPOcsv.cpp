@@ -22,7 +22,6 @@ constexpr CsvOrderValues kValues{
     .nullControls = true,
     .endsAtOtherCompany = true,
     .posting = kGtinPosting,
-    .keepsForeignLines = true,
     .keepsTurnedAway = true,
 };
 

@@ -88,6 +88,7 @@ CsvOrderImporter::Next clsMGBBT850csv::LookAtLine(Posting& posting) {
   if (&posting.values == &kMerchandise || !(*this)[INCOMINGPRODUCTNO].empty() || LineQuantity(posting) != 0) {
     return Next::kGoOn;
   }
+  if (!DeleteReplaced(posting)) return Next::kEnd;
   posting.log.Note(kRejection, words::kOrderCancelled.With(posting.entry.PONo));
   return TurnAway(posting);
 }

@@ -25,8 +25,8 @@ constexpr OrderRule kStoredOrder[] = {
     {                                                                .number = kRejection, .message = words::kAlreadyExists},
 };
 constexpr OrderRule kNewOrder[] = {
-    {.purpose = "4", .version = Version::kGiven, .number = kWarning,   .message = words::kCancelBalance},
-    {.purpose = "1",                             .number = kWarning,   .message = words::kCancel},
+    {.purpose = "4", .version = Version::kGiven, .number = kWarning,   .message = words::kCancelBalance, .fate = Fate::kCancel},
+    {.purpose = "1",                             .number = kWarning,   .message = words::kCancel,        .fate = Fate::kCancel},
     {.type = "BK",                               .number = kRejection, .message = words::kBlanketDash},
     {.directToStore = true,                      .number = kRejection, .message = words::kDirectToStore},
 };

@@ -30,7 +30,6 @@ constexpr CsvOrderValues kValues{
     .nullControls = true,
     .endsAtOtherCompany = true,
     .posting = BulkPosting(),
-    .keepsForeignLines = true,
     .keepsTurnedAway = true,
 };
 

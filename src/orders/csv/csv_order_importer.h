@@ -37,7 +37,12 @@ class CsvOrderImporter : public OrderImporter {
 
     const PostingValues& values;
     std::string firstLineKey;
-    std::string lineSequence;  // of the line last read
+    std::string lineSequence;      // of the line last read
+    std::int64_t lineNo = 0;       // its number in the file
+    std::size_t fields = 0;        // that it has, and
+    std::size_t fieldsBefore = 0;  // the line before it in the order
+    bool ended = true;             // it has its end
+    bool listed = true;            // it was there, whole, when the file was listed
   };
 
   // The line's product: the number it is ordered by, and the product that stands for.
@@ -74,7 +79,7 @@ class CsvOrderImporter : public OrderImporter {
 
   // The field of the line in hand, blanks cut.
   std::string_view operator[](OrderField field) const { return line_[field]; }
-  // The number at the field's start; 0 when it is out of range and the user says to go on.
+  // The number at the field's start, see ReadNumber.
   double NumberOf(OrderField field);
   // An advertised date as some partners want it back: the last four characters of a long one.
   static std::string AdvertisedText(std::string_view date);
@@ -93,13 +98,17 @@ class CsvOrderImporter : public OrderImporter {
   bool TakeMapFile(const std::string& path);
   bool ExpectFields();
   bool SetOrderList(const std::string& path);
-  void ListTransactions();
+  bool ListTransactions();
+  void ListLines(std::int64_t& lineNo);
+  void WarnOfCutLine(const Line& line, std::int64_t lineNo);
   bool IsOurs() const;
   void JoinLineKey(std::string& key) const;
   bool ReadLine(Line& line);
 
   bool SettleFile();
   void DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRange>& posted);
+  void Keep(WorkQueue::Rewrite& rewrite, std::string_view bytes);
+  bool WasListed(const Line& line) const { return line.End() <= listedTo_; }
   void SettledKey(std::string& key, std::string& number) const;
   std::string SettledKey(const ListedOrder& entry) const;
   std::string SettledKey(const Order& stored) const;
@@ -108,11 +117,16 @@ class CsvOrderImporter : public OrderImporter {
   // Raises RunTimeError when the order file isn't open.
   LineReader& Lines();
   void CloseOrderFile();
+  bool StillStandsAt(std::uint64_t position, const ListedOrder& entry);
   void CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t begin, std::uint64_t end);
 
   Next StartPosting(Posting& posting);
   bool SeekTo(const ListedOrder& entry);
   bool NextLine(Posting& posting);
+  void NeedListedOrder(const Posting& posting) const;
+  void NeedWholeLine(const Posting& posting) const;
+  void NeedControls(const Posting& posting) const;
+  Next PostLines(Posting& posting);
   OrderFacts Facts(const Posting& posting) const;
   Next ReadLines(Posting& posting);
   bool EndsTransaction(const Posting& posting, std::string& key) const;
@@ -125,6 +139,8 @@ class CsvOrderImporter : public OrderImporter {
   bool mapLoaded_ = false;
   CsvOrderLine line_;
   std::optional<LineReader> lines_;
+  std::uint64_t listedTo_ = 1;  // where the file ended when it was listed, from 1
+  Posting* posting_ = nullptr;  // the call in hand
   BackupFile backup_;
   ProcessedOrders processed_;
 };

@@ -1,6 +1,7 @@
 // The line in hand of a CSV order file, by field name.
 #pragma once
 
+#include <algorithm>
 #include <array>
 #include <span>
 #include <string>
@@ -11,6 +12,11 @@
 #include "orders/csv/order_fields.h"
 
 namespace partnerkit::orders {
+
+// The fields of a line by its commas; quotes that protect some aside.
+inline std::size_t CountFields(std::string_view line) {
+  return static_cast<std::size_t>(std::ranges::count(line, ',')) + 1;
+}
 
 class CsvOrderLine {
  public:

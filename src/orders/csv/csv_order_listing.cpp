@@ -35,6 +35,7 @@ bool CsvOrderImporter::Init(System& system, std::int16_t EDIDocId, ColumnTable& 
   return Procedure("Function Init", false, [&](bool& done) {
     Bind(system, EDIDocId);
     listed_.clear();
+    unsettled_.clear();
     processed_.Clear();
     Columns = OrderColumns();
     const std::string backup(Str(OwnCompany().POBackupFile));
@@ -45,6 +46,7 @@ bool CsvOrderImporter::Init(System& system, std::int16_t EDIDocId, ColumnTable& 
         return;
       }
     }
+    if (!Try([&] { NoteBackedUp(backup_.Finished()); }) || !Try([&] { backup_.Settle(); })) return;
     done = true;
   });
 }
@@ -107,19 +109,38 @@ bool CsvOrderImporter::SetOrderList(const std::string& path) {
     listed_.clear();
     if (!FindOrderFile(path) || !HoldOrderFile(path)) return;
     lines_.emplace(queue_.File());
-    ListTransactions();
+    if (!ListTransactions()) return;
+    ForgetUnlisted();
     if (values_.importsProducts && !Str(OwnCompany().ProductImportFile).empty()) ImportProduct(*this);
     listed = true;
   });
 }
 
-void CsvOrderImporter::ListTransactions() {
+// False when the file cannot be an order file.
+bool CsvOrderImporter::ListTransactions() {
+  lines_->Seek(queue_.Begin());
+  std::int64_t lineNo = 0;
+  try {
+    ListLines(lineNo);
+  } catch (const LineTooLong&) {
+    WriteLog(
+        kRejection, "SetOrderList",
+        "Line " + std::to_string(lineNo + 1) + " of " + fileName_ + " is longer than 64 MB, as no order's line is.");
+    return false;
+  }
+  listedTo_ = lines_->Position();
+  return true;
+}
+
+void CsvOrderImporter::ListLines(std::int64_t& lineNo) {
   const std::size_t columns = std::max(
       {line_.ColumnsFor(kListingFields), line_.ColumnsFor(values_.lineKey), line_.ColumnsFor(values_.orderKey)});
   std::string lastTransaction, firstLine, transaction, lineKey, number;
   for (Line line; ReadLine(line);) {
+    ++lineNo;
     if (values_.skipsBlankLines && TrimBlanks(line.text).empty()) continue;
     line_.Read(line.text, columns);
+    if (!line.ended) WarnOfCutLine(line, lineNo);
     line_.Join(values_.transactionKey, transaction);
     JoinLineKey(lineKey);
     if (transaction == lastTransaction && lineKey != firstLine) continue;
@@ -132,9 +153,19 @@ void CsvOrderImporter::ListTransactions() {
     entry.PONo = OrderNumber(number);
     entry.PODate = OrderDate(line_[OrderField::PODATE]);
     entry.FilePos = static_cast<std::int64_t>(line.position);
+    entry.line = lineNo;
     lastTransaction = transaction;
     firstLine = lineKey;
   }
+}
+
+// Nobody can tell yet whose line it is.
+void CsvOrderImporter::WarnOfCutLine(const Line& line, std::int64_t lineNo) {
+  if (TrimBlanks(line.text).empty() || CountFields(line.text) >= line_.ColumnsFor(kAddresses)) return;
+  WriteLog(
+      kWarning, "SetOrderList",
+      "Line " + std::to_string(lineNo) + " of " + fileName_ +
+          " stops before its EDI addresses, at the end of the file: an upload that isn't finished. It stays there.");
 }
 
 std::string_view CsvOrderImporter::OrderNumber(std::string&) const { return line_[OrderField::PONUMBER]; }
@@ -155,7 +186,16 @@ bool CsvOrderImporter::IsOurs() const {
 // user says to go on: taken for the end of the file, it would cut an order short.
 bool CsvOrderImporter::ReadLine(Line& line) {
   bool read = false;
-  if (!Try([&] { read = Lines().Read(line); })) throw ErrorHandling::LeaveProcedure{};
+  std::optional<LineTooLong> tooLong;
+  const auto readOne = [&] {
+    try {
+      read = Lines().Read(line);
+    } catch (const LineTooLong& error) {
+      tooLong = error;
+    }
+  };
+  if (!Try(readOne)) throw ErrorHandling::LeaveProcedure{};
+  if (tooLong) throw *tooLong;
   return read;
 }
 

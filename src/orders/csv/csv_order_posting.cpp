@@ -28,6 +28,25 @@ CsvOrderImporter::Posting::Posting(CsvOrderImporter& importer, ListedOrder& list
   checks.SetRules(postingValues.checks);
 }
 
+namespace {
+
+// What `object` is set to as long as the scope lasts.
+template <class T>
+class SetFor {
+ public:
+  SetFor(T*& object, T& value) : object_(object) { object_ = &value; }
+  ~SetFor() { object_ = nullptr; }
+  SetFor(const SetFor&) = delete;
+  SetFor& operator=(const SetFor&) = delete;
+
+ private:
+  T*& object_;
+};
+
+std::string LineText(std::int64_t number) { return "line " + std::to_string(number); }
+
+}  // namespace
+
 std::int32_t CsvOrderImporter::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
   return Procedure("Function Process", std::int32_t{0},
                    [&](std::int32_t& orderId) { orderId = PostRow(a_lRowNum, nullptr, vtErrorLog); });
@@ -44,20 +63,67 @@ std::int32_t CsvOrderImporter::PostRow(std::int32_t row, const PostingValues* va
     values = &ValuesOf();
   }
   Posting posting(*this, *entry, *values, errorList);
+  const SetFor<Posting> inHand(posting_, posting);
+  try {
+    if (PostLines(posting) == Next::kGoOn) return Store(posting, posting.lineSequence);
+  } catch (const Unreadable& fault) {
+    Refuse(posting, fault);
+  }
+  return 0;
+}
+
+CsvOrderImporter::Next CsvOrderImporter::PostLines(Posting& posting) {
   const PostingValues& chosen = posting.values;
   if (!BeginPosting(posting) || StartPosting(posting) == Next::kEnd ||
       SettleStoredOrder(posting, Facts(posting), chosen.storedOrder, chosen.procedure, chosen.announceStored) ==
           Next::kEnd ||
       RefuseNewOrder(posting, Facts(posting), chosen.newOrder) == Next::kEnd) {
-    return 0;
+    return Next::kEnd;
   }
   FillHeader(posting);
-  return ReadLines(posting) == Next::kEnd ? 0 : Store(posting, posting.lineSequence);
+  return ReadLines(posting);
 }
 
 // Finds the transaction's first line.
 CsvOrderImporter::Next CsvOrderImporter::StartPosting(Posting& posting) {
-  return SeekTo(posting.entry) && NextLine(posting) ? Next::kGoOn : Next::kEnd;
+  posting.lineNo = posting.entry.line - 1;
+  if (!SeekTo(posting.entry) || !NextLine(posting)) return Next::kEnd;
+  NeedListedOrder(posting);
+  WarnOfNoNumber(posting, LineText(posting.lineNo));
+  return Next::kGoOn;
+}
+
+// A program that doesn't ask for the hold may have written over the file.
+void CsvOrderImporter::NeedListedOrder(const Posting& posting) const {
+  std::string number, key;
+  line_.Join(values_.transactionKey, key);
+  if (OrderNumber(number) == posting.entry.PONo && key == posting.entry.Controls() && IsOurs()) return;
+  throw Unreadable{LineText(posting.lineNo) + ": the file " + fileName_ +
+                   " has changed since it was listed, and begins another order here"};
+}
+
+// A last line that stops short is an upload that isn't finished: its quantity, or a part of it, is still to come.
+void CsvOrderImporter::NeedWholeLine(const Posting& posting) const {
+  if (!posting.listed) {
+    throw Unreadable{LineText(posting.lineNo) + ": the file " + fileName_ +
+                     " has grown by this line of the order since it was listed"};
+  }
+  if (posting.ended) return;
+  const OrderField quantity[] = {posting.values.quantity};
+  const std::size_t needed = line_.ColumnsFor(quantity);
+  if (posting.fields > needed ||
+      (posting.fields == needed && !line_[quantity[0]].empty() && posting.fields >= posting.fieldsBefore)) {
+    return;
+  }
+  throw Unreadable{LineText(posting.lineNo) + ": the last line of the file " + fileName_ + " stops before the end of " +
+                   std::string(Name(quantity[0])) + " and has no line end: an upload that isn't finished"};
+}
+
+// The same, of a line that stops before it says which order it is of: it may be this one.
+void CsvOrderImporter::NeedControls(const Posting& posting) const {
+  if (posting.ended || posting.fields > line_.ColumnsFor(values_.transactionKey)) return;
+  throw Unreadable{LineText(posting.lineNo) + ": the last line of the file " + fileName_ +
+                   " stops before it says which order it is of, and has no line end: an upload that isn't finished"};
 }
 
 bool CsvOrderImporter::SeekTo(const ListedOrder& entry) {
@@ -114,9 +180,14 @@ void CsvOrderImporter::FillHeader(Posting& posting) {
 CsvOrderImporter::Next CsvOrderImporter::ReadLines(Posting& posting) {
   JoinLineKey(posting.firstLineKey);
   std::string key;
-  do {
+  for (;;) {
+    NeedWholeLine(posting);
     if (LineCounts() && TakeLine(posting) == Next::kEnd) return Next::kEnd;
-  } while (NextLine(posting) && !EndsTransaction(posting, key));
+    posting.fieldsBefore = posting.fields;
+    if (!NextLine(posting)) return Next::kGoOn;
+    if (EndsTransaction(posting, key)) break;
+  }
+  NeedControls(posting);
   return Next::kGoOn;
 }
 
@@ -126,8 +197,12 @@ bool CsvOrderImporter::NextLine(Posting& posting) {
   Line line;
   do {
     if (!ReadLine(line)) return false;
+    ++posting.lineNo;
   } while (TrimBlanks(line.text).empty());
   line_.Read(line.text);
+  posting.ended = line.ended;
+  posting.listed = WasListed(line);
+  posting.fields = CountFields(line.text);
   posting.lineSequence = line_[SEQUENTIALLINENO];
   return true;
 }
@@ -196,7 +271,8 @@ LineClaims CsvOrderImporter::Claims(std::string_view productNo) const {
 }
 
 double CsvOrderImporter::NumberOf(OrderField field) {
-  return Try([&] { return NumberAtStart(line_[field]); });
+  const bool isQuantity = field == posting_->values.quantity || field == ALLOCATEQUANTITY;
+  return ReadNumber(*posting_, line_[field], LineText(posting_->lineNo), Name(field), isQuantity);
 }
 
 std::string CsvOrderImporter::AdvertisedText(std::string_view date) {

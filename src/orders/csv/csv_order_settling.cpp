@@ -7,8 +7,6 @@ namespace partnerkit::orders {
 
 namespace {
 
-constexpr OrderField kAddresses[] = {OrderField::PARTNEREDIADDR, OrderField::COMPANYEDIADDR};
-
 // Adds a line to the ranges; lines that follow each other make one range.
 void Extend(std::vector<ByteRange>& ranges, const Line& line) {
   if (!ranges.empty() && ranges.back().end == line.position) {
@@ -38,46 +36,59 @@ bool CsvOrderImporter::Term() {
 
 // Rewrites the file without the orders dealt with; the lines of the posted ones go to the backup.
 bool CsvOrderImporter::SettleFile() {
-  WorkQueue::Rewrite rewrite(queue_);
+  WorkQueue::Rewrite rewrite(queue_, TellOfRewrite());
   std::vector<ByteRange> posted;
   if (!Try([&] { DealOut(rewrite, posted); })) return false;
-  if (backup_.IsOpen() && !Try([&] { backup_.Append(queue_.File(), queue_.Path(), posted); })) return false;
+  if (backup_.IsOpen() && !Try([&] { backup_.Append(queue_.File(), queue_.Path(), posted, unsettled_); })) return false;
   if (!Try([&] { rewrite.Claim(); })) return false;
-  {
-    const HandlerOff off(Errors());
-    Try([&] { rewrite.Replace(); });
+  if (PutInPlace([&] { rewrite.Replace(); })) {
+    ForgetUnsettled();
+  } else if (backup_.IsOpen() && !Try([&] { NoteBackedUp(unsettled_); })) {
+    return false;
   }
   return Try([&] { backup_.Settle(); });
 }
 
-// Copies what stays to the temporary file and collects the posted ranges.
+// Copies what stays to the draft and collects the posted ranges. Only what was listed leaves: another company's lines
+// stay whatever their number, and so does what a mailbox that doesn't ask for the hold has added meanwhile.
 void CsvOrderImporter::DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRange>& posted) {
   rewrite.Begin();
   posted.clear();
-  const std::size_t columns = std::max(line_.ColumnsFor(values_.orderKey), line_.ColumnsFor(kAddresses));
   const std::size_t controls = values_.settlesByControls ? line_.ColumnsFor(values_.transactionKey) : 0;
+  const std::size_t columns = std::max({line_.ColumnsFor(values_.orderKey), line_.ColumnsFor(kAddresses), controls});
   std::string key, number, lastKey;
   std::optional<std::int32_t> outcome = processed_.Find(lastKey);
   LineReader& lines = Lines();
-  lines.Seek(1);
+  lines.Seek(queue_.Begin());
+  std::uint64_t length = 0;
   do {
+    length = queue_.File().Length();
     for (Line line; lines.Read(line);) {
-      if (values_.skipsBlankLines && TrimBlanks(line.text).empty()) continue;
-      line_.Read(line.text, std::max(columns, controls));
+      if (values_.skipsBlankLines && WasListed(line) && TrimBlanks(line.text).empty()) continue;
+      line_.Read(line.text, columns);
       SettledKey(key, number);
       if (key != lastKey) {
         lastKey = key;
         outcome = processed_.Find(key);
       }
-      if (!outcome || (values_.keepsForeignLines && !IsOurs())) {
-        rewrite.Keep(line.raw);
+      if (!outcome || !WasListed(line) || !IsOurs()) {
+        Keep(rewrite, line.raw);
       } else if (*outcome > 0) {
         Extend(posted, line);
       }
     }
     rewrite.Finish();
-    // A mailbox that doesn't ask for the hold may have added lines meanwhile.
-  } while (queue_.File().Length() >= lines.Position());
+  } while (queue_.File().Length() > length);
+  // The Ctrl-Z that the file ends with.
+  if (rewrite.Empty()) return;
+  rewrite.KeepRange({lines.Position(), length + 1});
+  rewrite.Finish();
+}
+
+// A byte order mark stays in front of whatever stays.
+void CsvOrderImporter::Keep(WorkQueue::Rewrite& rewrite, std::string_view bytes) {
+  if (rewrite.Empty()) rewrite.KeepRange({1, queue_.Begin()});
+  rewrite.Keep(bytes);
 }
 
 // What the line's order is dealt with under.
@@ -106,7 +117,11 @@ bool CsvOrderImporter::Delete(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
     const auto begin = static_cast<std::uint64_t>(entry->FilePos);
     const auto end = EndOf(*entry);
     if (!end) return;
-    WorkQueue::Rewrite rewrite(queue_);
+    if (!StillStandsAt(begin, *entry)) {
+      log.Note(kRejection, "The file " + fileName_ + " has changed since it was listed; nothing is deleted from it.");
+      return;
+    }
+    WorkQueue::Rewrite rewrite(queue_, TellOfRewrite());
     if (!Try([&] { CopyAllBut(rewrite, begin, *end); }) || !Try([&] { rewrite.Claim(); }) ||
         !Try([&] { rewrite.Replace(); })) {
       return;
@@ -118,16 +133,31 @@ bool CsvOrderImporter::Delete(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
   });
 }
 
-// A line of the transaction is any that ends behind its begin and not beyond its end.
+// Raises RunTimeError.
+bool CsvOrderImporter::StillStandsAt(std::uint64_t position, const ListedOrder& entry) {
+  Line line;
+  std::string number, key;
+  Lines().Seek(position);
+  if (!ReadLine(line)) return false;
+  line_.Read(line.text);
+  line_.Join(values_.transactionKey, key);
+  return OrderNumber(number) == entry.PONo && key == entry.Controls();
+}
+
+// Of the lines up to the next row's, another company's and those that came since the listing stay.
 void CsvOrderImporter::CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t begin, std::uint64_t end) {
   rewrite.Begin();
   LineReader& lines = Lines();
-  lines.Seek(1);
+  lines.Seek(queue_.Begin());
   for (Line line; lines.Read(line);) {
-    const bool inside = line.End() > begin && line.End() <= end;
+    const bool inside = line.position >= begin && line.End() <= end && WasListed(line);
+    if (inside) line_.Read(line.text, line_.ColumnsFor(kAddresses));
     // Some mailboxes leave segments of an interchange between the lines.
-    if (!inside || (!values_.deletesEnvelopes && IsEnvelopeSegment(line.text))) rewrite.Keep(line.raw);
+    const bool envelope = IsEnvelopeSegment(line.text);
+    const bool goes = envelope ? values_.deletesEnvelopes : TrimBlanks(line.text).empty() || IsOurs();
+    if (!inside || !goes) Keep(rewrite, line.raw);
   }
+  if (!rewrite.Empty()) rewrite.KeepRange({lines.Position(), queue_.File().Length() + 1});
   rewrite.Finish();
 }
 

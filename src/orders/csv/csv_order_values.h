@@ -17,6 +17,8 @@ inline constexpr OrderField kLineKey[] = {OrderField::PONUMBER, OrderField::SEQU
                                           OrderField::BUYINGLOCPARTNERNO, OrderField::INCOMINGPRODUCTNO};
 inline constexpr OrderField kOrderKey[] = {OrderField::PONUMBER};
 
+inline constexpr OrderField kAddresses[] = {OrderField::PARTNEREDIADDR, OrderField::COMPANYEDIADDR};
+
 // A text of a record that is one field of the line: as it stands, or null when empty.
 template <class R>
 struct FieldText {
@@ -113,7 +115,6 @@ struct CsvOrderValues {
   PostingValues posting = {};
 
   // Settling.
-  bool keepsForeignLines = false;      // lines of other addresses stay, whatever their number
   bool keepsTurnedAway = false;        // an order turned away stays in the file
   bool settlesByControls = false;      // a line leaves with its own transaction, not with its order number
   bool deletesEnvelopes = false;       // `Delete` takes envelope segments inside the transaction along

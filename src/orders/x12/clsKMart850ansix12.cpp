@@ -21,7 +21,7 @@ constexpr OrderRule kStoredOrder[] = {
 };
 constexpr OrderRule kNewOrder[] = {
     {.type = "BK",    .number = kRejection, .message = words::kBlanketNotedDash, .fate = Fate::kGoOn},
-    {.purpose = "01", .number = kRejection, .message = words::kChangeCancelsNothing},
+    {.purpose = "01", .number = kRejection, .message = words::kChangeCancelsNothing, .fate = Fate::kCancel},
 };
 constexpr LineElements kLines[] = {
     {},

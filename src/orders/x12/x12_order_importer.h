@@ -10,6 +10,8 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <unordered_map>
+#include <vector>
 
 #include "frame/segment_reader.h"
 #include "orders/order_importer.h"
@@ -41,6 +43,7 @@ class X12OrderImporter : public OrderImporter {
     std::shared_ptr<OrderLine> line;
     std::optional<ProductPrice> price;  // of the line in hand, when costs are checked
     int lines = 0;
+    std::string cutBy;  // what ended the transaction before its CTT
   };
 
   // --- Steps that partners do otherwise
@@ -55,12 +58,13 @@ class X12OrderImporter : public OrderImporter {
 
   Next ChangeStored(OrderPosting& posting, Order& stored) override;
 
-  // The segment in hand, and its elements; empty for one that is missing, when the user says to go on.
+  // The segment in hand, and its elements. Raises Unreadable for one that is missing.
   const X12Segment& InHand() const { return segment_; }
-  std::string Element(int n, ElementForm form = {});
+  std::string Element(int n, ElementForm form = {}) const;
   // The same of an element that may be left out: as it stands, or in the other form where it ends the segment.
-  std::string ElementOrEnd(int n, ElementForm atEnd);
-  double NumberOf(std::string_view text);
+  std::string ElementOrEnd(int n, ElementForm atEnd) const;
+  // The number that element n begins with, see ReadNumber.
+  double NumberOf(Posting& posting, int n, std::string_view text, bool isQuantity = false);
   // Takes the next segment in hand. False at the end of the file. A segment that cannot be read leaves the procedure
   // even when the user says to go on: taken for the end of the file, it would cut an order short.
   bool NextSegment();
@@ -68,12 +72,24 @@ class X12OrderImporter : public OrderImporter {
   const X12OrderValues& values_;
 
  private:
+  // An orders group in hand while listing.
+  struct Group {
+    std::string header;
+    std::string control;
+    std::string fault;  // why the header cannot be read; empty when it can
+    int transactions = 0;
+  };
+
   bool SetOrderList(const std::string& path);
   void Archive(const std::string& path);
+  void KeepArchived(const std::string& path, const std::string& archived);
   bool WalkFile();
-  ListedOrder BeginEntry();
+  void BeginInterchange();
+  Group BeginGroup();
+  ListedOrder BeginEntry(const Group& group);
   void CompleteEntry(ListedOrder& entry);
-  bool ProcessFA(std::string_view gs, int transactions);
+  bool ProcessFA(const Group& group);
+  std::string SegmentText() const;
   // Takes the file's next segment in hand. False at its end. Raises RunTimeError.
   bool ReadSegment();
   SegmentReader& Segments();
@@ -84,7 +100,12 @@ class X12OrderImporter : public OrderImporter {
   void MarkTurnedAway(ListedOrder& entry) override { entry.done = true; }
   void MarkPosted(ListedOrder& entry) override { entry.done = true; }
   void Export(OrderPosting& posting) override;
+  bool EarlierStays(const ListedOrder& entry) override;
 
+  Next PostTransaction(Posting& posting);
+  void NeedListedOrder(const Posting& posting);
+  Next CutShort(Posting& posting);
+  void TellCutShort(Posting& posting);
   Next ReadTransaction(Posting& posting);
   Next TakeBeginning(Posting& posting);
   void TakeN1(Posting& posting);
@@ -92,8 +113,8 @@ class X12OrderImporter : public OrderImporter {
   void CheckLine(Posting& posting, const LineElements& elements, const std::string& number);
   void FillLine(Posting& posting, const LineElements& elements, OrderLine& line);
   Text Sku();
-  // False, with the error told, when the segment in hand stands before any line.
-  bool HasLine(const Posting& posting);
+  // Raises Unreadable when the segment in hand stands before any line.
+  void NeedLine(const Posting& posting) const;
   void TakeRetail(Posting& posting);
   void TakePack(Posting& posting);
   Next TakeStores(Posting& posting);
@@ -106,7 +127,9 @@ class X12OrderImporter : public OrderImporter {
 
   X12Segment segment_;
   std::optional<SegmentReader> segments_;
-  std::string interchangeCtl_, groupCtl_;  // of the envelope in hand while listing
+  std::string interchangeCtl_;    // of the envelope in hand while listing
+  std::string interchangeFault_;  // why its header cannot be read; empty when it can
+  std::unordered_map<std::string, std::vector<std::size_t>> sameNumber_;  // rows by order number, made when asked for
   bool listedWhole_ = false;
   std::uint64_t listedTo_ = 1;  // the file's end when it was listed, from 1
 };

@@ -22,7 +22,10 @@ X12OrderImporter::Next X12OrderImporter::TakeLine(Posting& posting, const LineEl
   line->ProductNo = number;
   FillLine(posting, elements, *line);
   // The same product again would leave no telling which of the two its stores are for.
-  if (!Try([&] { posting.draft.lines.Add(line, number); })) throw ErrorHandling::LeaveProcedure{};
+  if (posting.draft.lines.Find(number)) {
+    throw Unreadable{SegmentText() + ": product " + number + " stands in two lines of the order"};
+  }
+  posting.draft.lines.Add(line, number);
   posting.line = line;
   posting.distributed = false;
   return Next::kGoOn;
@@ -49,8 +52,8 @@ void X12OrderImporter::FillLine(Posting& posting, const LineElements& elements, 
   line.LineNo = values_.countsLines ? std::to_string(posting.lines) : Element(elements.lineNo);
   line.UOM = Element(elements.uom);
   line.PriceCode = Element(elements.priceCode);
-  line.Cost = NumberOf(Element(elements.cost));
-  line.Quantity = NumberOf(Element(elements.quantity));
+  line.Cost = NumberOf(posting, elements.cost, Element(elements.cost));
+  line.Quantity = NumberOf(posting, elements.quantity, Element(elements.quantity), true);
   line.SKU = Sku();
 }
 
@@ -64,34 +67,32 @@ Text X12OrderImporter::Sku() {
 }
 
 void X12OrderImporter::TakeRetail(Posting& posting) {
-  if (!values_.retail || !HasLine(posting)) return;
+  if (!values_.retail) return;
+  NeedLine(posting);
   const std::string retail = Element(3, *values_.retail);
   // The price record is at hand only when costs are checked as well.
   if (Document().ValidateRetail && posting.price) posting.checks.CheckRetail(*posting.price, retail);
-  posting.line->RetailPrice = NumberOf(retail);
+  posting.line->RetailPrice = NumberOf(posting, 3, retail);
 }
 
 void X12OrderImporter::TakePack(Posting& posting) {
-  if ((values_.packNumbers.empty() && !values_.packUOM) || !HasLine(posting)) return;
+  if (values_.packNumbers.empty() && !values_.packUOM) return;
+  NeedLine(posting);
   for (const PackNumber& number : values_.packNumbers) {
     const bool ends = segment_.PosBegSplat(number.element + 1) == 0;
     const std::string text = Element(number.element, ends ? ElementForm{ElementForm::kLast} : ElementForm{});
-    if (!text.empty()) *posting.line.*number.member = NumberOf(text);
+    if (!text.empty()) *posting.line.*number.member = NumberOf(posting, number.element, text);
   }
   if (values_.packUOM) posting.line->PackUOM = NullIfEmpty(Element(3, *values_.packUOM));
 }
 
-bool X12OrderImporter::HasLine(const Posting& posting) {
-  return Try([&] {
-    if (posting.line) return true;
-    throw RunTimeError(run_time::kNotSet, "The segment " + std::string(segment_.Text().substr(0, 60)) + " at byte " +
-                                              std::to_string(segment_.Begin()) + " stands before any line");
-  });
+void X12OrderImporter::NeedLine(const Posting& posting) const {
+  if (!posting.line) throw Unreadable{SegmentText() + ": it stands before any line of the order"};
 }
 
 // An SDQ gives quantities of the line to stores, in pairs; a line may have several.
 X12OrderImporter::Next X12OrderImporter::TakeStores(Posting& posting) {
-  if (!HasLine(posting)) return Next::kGoOn;
+  NeedLine(posting);
   for (int n = kFirstStore; n <= kLastStore && segment_.PosBegSplat(n) != 0; n += 2) {
     const std::string store = Element(n);
     if (posting.n1 == values_.directToStore) {
@@ -101,7 +102,10 @@ X12OrderImporter::Next X12OrderImporter::TakeStores(Posting& posting) {
     }
     if (values_.rechecksStores) posting.locationLookedAt.clear();
     CheckBuyingLocn(posting, store, true, values_.storeWord);
-    const double quantity = NumberOf(ElementOrEnd(n + 1, values_.quantityForm));
+    if (segment_.PosBegSplat(n + 1) == 0) {
+      throw Unreadable{SegmentText() + ": store " + store + " has no quantity"};
+    }
+    const double quantity = NumberOf(posting, n + 1, ElementOrEnd(n + 1, values_.quantityForm), true);
     if (AddToLocation(posting, quantity) == Next::kEnd) return Next::kEnd;
   }
   posting.distributed = true;

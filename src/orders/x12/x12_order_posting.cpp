@@ -2,7 +2,6 @@
 #include <algorithm>
 
 #include "frame/delimited.h"
-#include "frame/numbers.h"
 #include "orders/order_export.h"
 #include "orders/order_store.h"
 #include "orders/x12/x12_order_importer.h"
@@ -22,21 +21,34 @@ std::int32_t X12OrderImporter::Process(std::int32_t a_lRowNum, ErrorList& vtErro
     ListedOrder* const entry = EntryOfRow(a_lRowNum);
     if (entry == nullptr || !Reaches(*entry)) return;
     Posting posting(*this, *entry, "Process", vtErrorLog);
-    posting.complete = false;
-    posting.checks.SetRules(values_.checks);
-    BeginPosting(posting);
-    Segments().Seek(static_cast<std::uint64_t>(entry->FilePos));
-    if (ReadTransaction(posting) == Next::kEnd) {
-      orderId = posting.result;
-      return;
+    try {
+      orderId = PostTransaction(posting) == Next::kEnd ? posting.result : Store(posting);
+    } catch (const Unreadable& fault) {
+      Refuse(posting, fault);
     }
-    if (values_.datesDefaultToToday) {
-      Order& header = posting.draft.header;
-      if (!header.CancelAfter) header.CancelAfter = Now().Date();
-      if (!header.NotBefore) header.NotBefore = Now().Date();
-    }
-    orderId = Store(posting);
   });
+}
+
+X12OrderImporter::Next X12OrderImporter::PostTransaction(Posting& posting) {
+  if (!posting.entry.fault.empty()) throw Unreadable{posting.entry.fault};
+  posting.complete = false;
+  posting.checks.SetRules(values_.checks);
+  BeginPosting(posting);
+  Segments().Seek(static_cast<std::uint64_t>(posting.entry.FilePos));
+  if (ReadTransaction(posting) == Next::kEnd) return Next::kEnd;
+  if (!posting.complete) TellCutShort(posting);
+  if (values_.datesDefaultToToday) {
+    Order& header = posting.draft.header;
+    if (!header.CancelAfter) header.CancelAfter = Now().Date();
+    if (!header.NotBefore) header.NotBefore = Now().Date();
+  }
+  return Next::kGoOn;
+}
+
+void X12OrderImporter::TellCutShort(Posting& posting) {
+  posting.log.Note(kRejection, "...Cannot process PO " + posting.entry.PONo + ", " + posting.cutBy +
+                                   ": the transaction ends here without its " + (posting.begun ? "CTT" : "beginning") +
+                                   ". It stays in the file.");
 }
 
 // Reads and checks the transaction's segments. Nothing is stored here: an order goes in whole or not at all. A
@@ -46,13 +58,13 @@ X12OrderImporter::Next X12OrderImporter::ReadTransaction(Posting& posting) {
     const std::string_view tag = segment_.Text().substr(0, 3);
     Next next = Next::kGoOn;
     if (IsOneOf(tag, values_.beginnings)) {
-      if (posting.begun) break;
+      if (posting.begun) return CutShort(posting);
       next = TakeBeginning(posting);
     } else if (tag == "CTT") {
       posting.complete = posting.begun;
       return Distribute(posting);
     } else if (EndsTransaction(tag)) {
-      break;
+      return CutShort(posting);
     } else if (tag == "DTM") {
       TakeDate(posting.draft.header);
     } else if (tag == "N1*") {
@@ -71,11 +83,27 @@ X12OrderImporter::Next X12OrderImporter::ReadTransaction(Posting& posting) {
     }
     if (next == Next::kEnd) return Next::kEnd;
   }
+  posting.cutBy = "the end of the file";
   return Next::kGoOn;
+}
+
+// With what ends the transaction in hand.
+X12OrderImporter::Next X12OrderImporter::CutShort(Posting& posting) {
+  posting.cutBy = SegmentText();
+  return Next::kGoOn;
+}
+
+// A program that doesn't ask for the hold may have written over the file.
+void X12OrderImporter::NeedListedOrder(const Posting& posting) {
+  if (OrderNumber() == posting.entry.PONo) return;
+  throw Unreadable{SegmentText() + ": the file " + fileName_ +
+                   " has changed since it was listed, and begins another order here"};
 }
 
 X12OrderImporter::Next X12OrderImporter::TakeBeginning(Posting& posting) {
   posting.begun = true;
+  NeedListedOrder(posting);
+  WarnOfNoNumber(posting, SegmentText());
   const std::string purpose = Element(1), type = Element(2);
   OrderFacts facts;
   facts.purpose = purpose;
@@ -151,16 +179,39 @@ void X12OrderImporter::Export(OrderPosting& posting) {
   if (values_.exports) ExportOrder(*this, posting.log, posting.draft.header);
 }
 
-std::string X12OrderImporter::Element(int n, ElementForm form) {
-  return Try([&] { return std::string(segment_.Read(n, form)); });
+// "segment SDQ*EA*92*0001 at byte 812".
+std::string X12OrderImporter::SegmentText() const {
+  constexpr std::size_t kShown = 60;
+  const std::string_view text = segment_.Text();
+  return "segment " + std::string(text.substr(0, kShown)) + (text.size() > kShown ? "..." : "") + " at byte " +
+         std::to_string(segment_.Begin());
 }
 
-std::string X12OrderImporter::ElementOrEnd(int n, ElementForm atEnd) {
+std::string X12OrderImporter::Element(int n, ElementForm form) const {
+  try {
+    return std::string(segment_.Read(n, form));
+  } catch (const RunTimeError& error) {
+    throw Unreadable{AsPartOfSentence(error.Description())};
+  }
+}
+
+std::string X12OrderImporter::ElementOrEnd(int n, ElementForm atEnd) const {
   return Element(n, segment_.PosEndSplat(n) != 0 ? ElementForm{} : atEnd);
 }
 
-double X12OrderImporter::NumberOf(std::string_view text) {
-  return Try([&] { return NumberAtStart(text); });
+double X12OrderImporter::NumberOf(Posting& posting, int n, std::string_view text, bool isQuantity) {
+  const std::string_view tag = segment_.Text().substr(0, segment_.Text().find('*'));
+  const std::string name = std::string(tag) + (n < 10 ? "0" : "") + std::to_string(n);
+  return ReadNumber(posting, TrimBlanks(text), SegmentText(), name, isQuantity);
+}
+
+// Rows by number are looked up only here, which few files need.
+bool X12OrderImporter::EarlierStays(const ListedOrder& entry) {
+  if (sameNumber_.empty()) {
+    for (std::size_t row = 0; row < listed_.size(); ++row) sameNumber_[listed_[row].PONo].push_back(row);
+  }
+  const auto own = static_cast<std::size_t>(&entry - listed_.data());
+  return std::ranges::any_of(sameNumber_[entry.PONo], [&](std::size_t row) { return row < own && !listed_[row].done; });
 }
 
 }  // namespace partnerkit::orders

@@ -1,6 +1,8 @@
 // Settling an X12 order file: the rewrite without what is done, and the removal of one transaction.
 #include <algorithm>
+#include <array>
 
+#include "frame/delimited.h"
 #include "orders/x12/x12_order_importer.h"
 
 namespace partnerkit::orders {
@@ -8,6 +10,7 @@ namespace partnerkit::orders {
 namespace {
 
 constexpr std::string_view kLineEnd = "\r\n";
+constexpr char kCtrlZ = '\x1A';
 
 // The group's header with the mark that it was acknowledged.
 std::string Marked(std::string_view gs) {
@@ -68,7 +71,7 @@ class X12OrderImporter::Sweep {
   template <class F>
   void Run(F take) {
     rewrite_.Begin();
-    importer_.Segments().Seek(1);
+    importer_.Segments().Seek(importer_.queue_.Begin());
     while (importer_.ReadSegment()) {
       const X12Segment& segment = importer_.segment_;
       const X12Walk::Event event = walk_.Take(segment);
@@ -81,14 +84,28 @@ class X12OrderImporter::Sweep {
       }
     }
     std::uint64_t end = importer_.Segments().Position();
-    CopyUntouched(end);
+    if (untouchedFrom_ == 0) KeepCtrlZ(end);
+    else CopyUntouched(end);
     rewrite_.Finish();
     // The mailbox may still be at it.
     for (std::uint64_t length; (length = importer_.queue_.File().Length()) >= end; end = length + 1) {
-      rewrite_.KeepRange({end, length + 1});
+      KeepRange({end, length + 1});
       rewrite_.Finish();
       anyLeft_ = true;
     }
+  }
+
+  // Old systems end a file with it; it stays behind whatever does.
+  void KeepCtrlZ(std::uint64_t end) {
+    std::array<char, 1> last{};
+    if (rewrite_.Empty() || end < 2 || importer_.queue_.File().ReadAt(end - 2, last) == 0) return;
+    if (last[0] == kCtrlZ) rewrite_.Keep({last.data(), 1});
+  }
+
+  // A byte order mark stays in front of whatever stays.
+  void KeepRange(ByteRange range) {
+    if (rewrite_.Empty()) rewrite_.KeepRange({1, importer_.queue_.Begin()});
+    rewrite_.KeepRange(range);
   }
 
   // A mailbox that doesn't ask for the hold may have added to the file since it was listed. What it added of a group is
@@ -117,7 +134,7 @@ class X12OrderImporter::Sweep {
   }
 
   void CopyUntouched(std::uint64_t end) {
-    if (untouchedFrom_ != 0) rewrite_.KeepRange({untouchedFrom_, end});
+    if (untouchedFrom_ != 0) KeepRange({untouchedFrom_, end});
     untouchedFrom_ = 0;
   }
 
@@ -130,13 +147,17 @@ class X12OrderImporter::Sweep {
         listed[next_].FilePos != static_cast<std::int64_t>(st.End())) {
       return;
     }
-    keep_ = !listed[next_++].done;
+    const ListedOrder& entry = listed[next_++];
+    // Another control number: the file was written over since it was listed.
+    keep_ = !entry.done || TrimBlanks(st.Rest(8).substr(0, importer_.values_.longestControl)) != entry.TransactionCtl;
     if (keep_) anyLeft_ = true;
   }
 
   void CleanUp(const X12Segment& segment, X12Walk::Event event) {
     const std::string_view text = segment.Text();
-    if (segment.Begins("ISA")) {
+    if (segment.Overlong()) {
+      WriteAll(segment);
+    } else if (segment.Begins("ISA")) {
       Hold(interchange_, text);
     } else if (event == X12Walk::Event::kGroupBegins || segment.Begins("GS*")) {
       Hold(group_, Marked(text));
@@ -151,11 +172,16 @@ class X12OrderImporter::Sweep {
     } else if (segment.Begins("IEA")) {
       WriteClosing(interchange_, segment);
     } else if (importer_.values_.keepsBareSegments || (!text.empty() && text != kAcknowledged)) {
-      for (Held* held : {&interchange_, &group_, &transaction_}) WriteHeld(*held);
-      if (!keep_) return;
-      Write(segment);
-      if (inTransaction_ && !IsBlank(text)) anyLeft_ = true;
+      WriteAll(segment);
     }
+  }
+
+  // The segment, and before it the envelope that waits for one.
+  void WriteAll(const X12Segment& segment) {
+    for (Held* held : {&interchange_, &group_, &transaction_}) WriteHeld(*held);
+    if (!keep_) return;
+    Write(segment);
+    if (inTransaction_ && !IsBlank(segment.Text())) anyLeft_ = true;
   }
 
   static void Hold(Held& held, std::string_view text) { held = {std::string(text), true}; }
@@ -174,11 +200,12 @@ class X12OrderImporter::Sweep {
   void Write(const X12Segment& segment) {
     if (segment.Text().empty() && !importer_.values_.keepsBareSegments) return;
     if (!segment.Overlong()) return Write(segment.Text());
-    rewrite_.KeepRange({segment.Begin(), segment.Begin() + segment.Length()});
+    KeepRange({segment.Begin(), segment.Begin() + segment.Length()});
     Write(std::string_view());
   }
 
   void Write(std::string_view text) {
+    KeepRange({1, 1});
     rewrite_.Keep(text);
     if (!importer_.values_.wholeLines) rewrite_.Keep("~");
     rewrite_.Keep(kLineEnd);
@@ -208,7 +235,7 @@ bool X12OrderImporter::Term() {
 }
 
 bool X12OrderImporter::SettleFile() {
-  WorkQueue::Rewrite rewrite(queue_);
+  WorkQueue::Rewrite rewrite(queue_, TellOfRewrite());
   bool anyLeft = false;
   const auto settle = [&] {
     Sweep sweep(*this, rewrite);
@@ -216,11 +243,11 @@ bool X12OrderImporter::SettleFile() {
     anyLeft = sweep.AnythingLeft();
   };
   if (!Try(settle) || !Try([&] { rewrite.Claim(); })) return false;
-  const HandlerOff off(Errors());
-  Try([&] {
+  const bool settled = PutInPlace([&] {
     if (anyLeft) rewrite.Replace();
     else rewrite.Remove(values_.deletesTemporary);
   });
+  if (settled) ForgetUnsettled();
   return true;
 }
 
@@ -229,7 +256,7 @@ bool X12OrderImporter::Delete(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
     CallLog log(*this, "Delete", vtErrorLog);
     const ListedOrder* const entry = EntryOfRow(a_lRowNum);
     if (entry == nullptr) return;
-    WorkQueue::Rewrite rewrite(queue_);
+    WorkQueue::Rewrite rewrite(queue_, TellOfRewrite());
     const auto takeOut = [&] { Sweep(*this, rewrite).TakeOut(static_cast<std::uint64_t>(entry->FilePos)); };
     if (!Try(takeOut) || !Try([&] { rewrite.Claim(); }) || !Try([&] { rewrite.Replace(); })) return;
     CloseOrderFile();
