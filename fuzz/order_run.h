@@ -102,30 +102,39 @@ class OrderRun : private ImportRun {
            (Says(last, kWarned, "... Warning Purchase Order Cancel Request ") && !rules.cancelsInFile);
   }
 
+  static bool TakesBack(const LogRecord& last) {
+    const std::string_view message = Str(last.Message);
+    return message.ends_with(". Order cancelled.") || message.starts_with("Cannot process CANCELLATION. Original PO ") ||
+           message.starts_with("... Warning Purchase Order Change Request Cancel Balance Of ");
+  }
+
   // What became of one order.
   void Follow(const std::string& number, const std::string& key, std::int32_t id, const std::vector<LogRecord>& told,
               Settled& settled) {
+    const bool faulty = id == 0 && !told.empty() && told.back().ErrorNumber == 0 &&
+                        Str(told.back().Message).find(" import completed with errors.") != std::string_view::npos;
+    const bool posted = id > 0 || faulty;
     if (const auto stored = stored_.find(number); stored != stored_.end()) {
       const bool replaced = AnyWarns(told, {"... Warning Duplicate PO ", "... Warning Purchase Order Change ",
                                             "... Warning incomplete/scrapped PO "});
+      // A stored order goes when the new one is posted, or says that it is taken back.
+      const bool goes = replaced && (posted || TakesBack(told.back()));
       // The order is stored no longer: its lines stay, unless the new one is posted.
-      if (replaced) {
+      if (goes) {
         settled.posted.erase(stored->second.key);
         settled.done.erase(stored->second.key);
       }
-      if (replaced ||
+      if (goes ||
           AnyWarns(told, {"... Warning Purchase Order Cancel Request ", "... Warning Purchase Order CANCEL Request ",
                           "... Warning Purchase Order Response. "})) {
         stored_.erase(stored);
       }
     }
-    const bool faulty = id == 0 && !told.empty() && told.back().ErrorNumber == 0 &&
-                        Str(told.back().Message).find(" import completed with errors.") != std::string_view::npos;
-    if (id > 0 || faulty) {
+    if (posted) {
       stored_[number] = {faulty ? IdOf(number) : id, key, faulty};
       settled.posted.insert(key);
     }
-    if (id > 0 || faulty || (!told.empty() && TurnsAway(told.back()))) settled.done.insert(key);
+    if (posted || (!told.empty() && TurnsAway(told.back()))) settled.done.insert(key);
   }
 
   // All transactions of one number leave together: one that failed goes with another of its number that was dealt with.
@@ -137,7 +146,7 @@ class OrderRun : private ImportRun {
     for (const std::string_view line : lines) {
       if (rules.dropsBlankLines && IsBlank(line)) continue;
       const std::string key = lines_.Key(line);
-      const bool stays = rules.keepsForeignLines && !lines_.IsOurs(line);
+      const bool stays = !lines_.IsOurs(line);
       if (settled.posted.contains(key) && !stays) {
         moved += line;
         if (!line.ends_with('\n') && !line.ends_with('\r')) moved += "\r\n";

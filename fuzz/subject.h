@@ -33,7 +33,6 @@ struct ClassRules {
   bool releases = false;       // a release goes by its version, too
   bool dropsBlankLines = false;
   bool shortNumbers = false;       // a short number goes by its ship-to, too
-  bool keepsForeignLines = false;  // also those of a number that was dealt with
   bool keepsTurnedAway = false;
   bool linesMayNotCount = false;  // an order may be left without lines
 };
@@ -44,8 +43,8 @@ inline constexpr ClassRules kClassRules[] = {
     {.name = "PartnerKit.clsMYERDropShipPOcsv", .deletesEnvelopes = true},
     {.name = "PartnerKit.clsMGBBT850csv", .quotesProtectCommas = true, .settlesByControls = true, .cancelsInFile = true},
     {.name = "PartnerKit.clsKMart850csv", .cancelsInFile = true, .releases = true, .dropsBlankLines = true, .linesMayNotCount = true},
-    {.name = "PartnerKit.clsCMLFLFPOcsv", .shortNumbers = true, .keepsForeignLines = true, .keepsTurnedAway = true, .linesMayNotCount = true},
-    {.name = "PartnerKit.clsTargetBulkPOcsv", .keepsForeignLines = true, .keepsTurnedAway = true, .linesMayNotCount = true},
+    {.name = "PartnerKit.clsCMLFLFPOcsv", .shortNumbers = true, .keepsTurnedAway = true, .linesMayNotCount = true},
+    {.name = "PartnerKit.clsTargetBulkPOcsv", .keepsTurnedAway = true, .linesMayNotCount = true},
 };
 // clang-format on
 

@@ -124,6 +124,16 @@ double NumberAtStart(std::string_view text) {
   return negative ? 0 - value : value;
 }
 
+bool IsNumber(std::string_view text) {
+  const char* at = text.data();
+  const char* end = at + text.size();
+  while (at != end && IsBlank(*at)) ++at;
+  while (at != end && IsBlank(end[-1])) --end;
+  if (at != end && (*at == '-' || *at == '+')) ++at;
+  double value = 0;
+  return StartsNumber(at, end) && std::from_chars(at, end, value).ptr == end;
+}
+
 std::int32_t ToLong(double value) { return Narrowed<std::int32_t>(value); }
 
 std::int16_t ToInteger(double value) { return Narrowed<std::int16_t>(value); }

@@ -13,6 +13,9 @@ namespace partnerkit {
 // digits, a point and an exponent. Raises error 6 when the value is beyond a double.
 double NumberAtStart(std::string_view text);
 
+// Whether what NumberAtStart reads is all of the text, blanks around it aside.
+bool IsNumber(std::string_view text);
+
 // The nearest whole number, a half going to the even neighbour. Raise error 6 beyond 32 and 16 bits.
 std::int32_t ToLong(double value);
 std::int16_t ToInteger(double value);

@@ -42,7 +42,12 @@ void WorkQueue::Open(const std::string& path) {
   path_ = path;
   target_ = files_.Resolved(path);
   file_ = files_.OpenInput(path, Share::kExclusive);
-  begin_ = BehindByteOrderMark(*file_);
+  begin_ = 0;
+}
+
+std::uint64_t WorkQueue::Begin() {
+  if (begin_ == 0) begin_ = BehindByteOrderMark(File());
+  return begin_;
 }
 
 void WorkQueue::Close() { file_.reset(); }

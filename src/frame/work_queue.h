@@ -84,8 +84,9 @@ class WorkQueue {
   const std::string& Path() const { return path_; }
   // Raises RunTimeError when the file isn't open.
   InputFile& File();
-  // Where the file's text begins: behind a byte order mark, which stays in front of whatever else does.
-  std::uint64_t Begin() const { return begin_; }
+  // Where the file's text begins: behind a byte order mark, which stays in front of whatever else does. Raises
+  // RunTimeError.
+  std::uint64_t Begin();
 
   // A rewrite, in this order: `Begin` makes a draft beside the file, `Keep` takes what stays, `Finish` brings it to the
   // disk, `Claim` and `Replace` put it in the order file's place, with the rights of the old one. All raise
@@ -136,7 +137,7 @@ class WorkQueue {
   std::string path_;
   std::string target_;  // what a link of that path leads to
   std::unique_ptr<InputFile> file_;
-  std::uint64_t begin_ = 1;
+  std::uint64_t begin_ = 0;  // 0 until it is asked for
 };
 
 }  // namespace partnerkit

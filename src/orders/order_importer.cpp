@@ -14,12 +14,6 @@ constexpr std::string_view kDeleteOnEmpty = "#%DELETEONEMPTY";
 
 }  // namespace
 
-std::string AsPartOfSentence(std::string text) {
-  if (!text.empty() && text.front() >= 'A' && text.front() <= 'Z')
-    text.front() = static_cast<char>(text.front() + ('a' - 'A'));
-  return text;
-}
-
 bool OrderImporter::FindOrderFile(const std::string& path) {
   const HandlerOff off(Errors());
   std::uint64_t length = 0;
@@ -150,7 +144,7 @@ double OrderImporter::ReadNumber(OrderPosting& posting, std::string_view text, s
   } catch (const RunTimeError&) {
     throw Unreadable{said() + "is beyond all numbers"};
   }
-  const bool odd = !text.empty() && !DecimalOf(text);
+  const bool odd = !text.empty() && !IsNumber(text);
   if ((odd || (isQuantity && value < 0)) && posting.warned.insert(std::string(place).append(" ").append(name)).second) {
     posting.log.Note(kWarning, "PO " + posting.entry.PONo + ", " + said() +
                                    (odd ? "is not a number; it is read as " + NumberText(value) + "."

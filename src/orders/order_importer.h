@@ -23,9 +23,6 @@ struct Unreadable {
   std::string why;  // "line 17: ..."
 };
 
-// The text with a small first letter.
-std::string AsPartOfSentence(std::string text);
-
 class OrderImporter : public TranslatorBase {
  protected:
   enum class Next { kGoOn, kEnd };

@@ -14,7 +14,7 @@ constexpr std::size_t kColumns = 22;
 constexpr double kLeastWeight = 0.01;  // a product never weighs nothing
 
 // A number that is empty or a single blank is none.
-bool IsNumber(const std::string& productNo) { return !productNo.empty() && productNo != " "; }
+bool IsProductNo(const std::string& productNo) { return !productNo.empty() && productNo != " "; }
 
 void SetDefaults(const TranslatorBase& translator, Product& product) {
   product.PartnerId = translator.TradingPartner().PartnerId;
@@ -65,7 +65,7 @@ bool ImportOneProduct(TranslatorBase& translator, const ImportRecord& record) {
   Product product;
   SetStyle(product, record[1], record[2], record[3]);
   Find(store, Product::kByStyle, product);
-  bool known = IsNumber(product.ProductNo);
+  bool known = IsProductNo(product.ProductNo);
   if (known && product.ProductNo != record[7]) {
     ProductPrice price;
     price.ProductNo = product.ProductNo;
@@ -117,7 +117,7 @@ void AddProduct(TranslatorBase& translator, const ProductOfLine& line) {
     Product product;
     SetStyle(product, line.style, line.colour, line.size);
     translator.Try([&] { return Find(store, Product::kByStyle, product); });
-    bool known = IsNumber(product.ProductNo);
+    bool known = IsProductNo(product.ProductNo);
     if (known && product.ProductNo != line.numberAsRead) {
       if (!translator.Try([&] { return Delete(store, product); })) return;
       known = false;

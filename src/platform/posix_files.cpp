@@ -374,6 +374,8 @@ void PosixFiles::Copy(const std::string& from, const std::string& to) {
   if (FileIs(target, status)) Raise(run_time::kPathAccess, target, "A file cannot be copied onto itself");
   Draft draft = MakeDraft(target);
   const int out = draft.descriptor.Number();
+  // Ranges are never copied behind the end.
+  fcntl(out, F_SETFL, 0);
   int failure = fchmod(out, status.st_mode & 0777) == 0 ? CopyBytes(in.Number(), out) : errno;
   if (failure == 0 && std::rename(draft.name.c_str(), target.c_str()) != 0) failure = errno;
   if (const int cause = draft.descriptor.Close(); failure == 0) failure = cause;

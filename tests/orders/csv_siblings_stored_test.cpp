@@ -138,7 +138,7 @@ TEST(CsvSiblingsStoredTest, SettlesAnOrderByItsRules) {
       {kTarget, "",           blanketStored, {kExists},              kLeaves, kOld},
       {kTarget, "",                 kScrap,  {kScrapped, kCompleted}, kLeaves, kNew},
       // The stored order has gone before the blanket order is refused.
-      {kTarget, "POPURPOSECODE=07; POTYPECODE=BL", kStored, {kDuplicate, blanketComma}, kLeaves, {}},
+      {kTarget, "POPURPOSECODE=07; POTYPECODE=BL", kStored, {kDuplicate, blanketComma}, kLeaves, {"450001/0 of 999"}},
       {kTarget, "POTYPECODE=BL",    {},      {blanketComma},         kLeaves, {}},
       {kTarget, "POPURPOSECODE=01; POTYPECODE=RL", {}, {kCompleted}, kLeaves, kNew},
 

@@ -238,7 +238,8 @@ TEST(CsvSiblingsTest, TellsEveryFaultOfAnOrder) {
       {kMgb, kProduct, {"PRODUCTQUALIFIER=UP"}, {Refused(symbology)}},
       {kMgb, kProduct | kCost, {"UNITPRICE=12.51; RETAILUNITPRICE=1"}, {Refused(cost)}},
       {kMgb, kProduct | kRetail, {"UNITPRICE=1; RETAILUNITPRICE=$29; SKUPRODUCTKEYCODE=x"},
-       {Refused("product 93001 retail price $29 does not agree with database retail 29.95"), Refused(sku)}},
+       {Refused("product 93001 retail price $29 does not agree with database retail 29.95"), Refused(sku),
+        "W Process: PO 450001, line 1: RETAILUNITPRICE \"$29\" is not a number; it is read as 0."}},
       // One message for each product, and for a location each time that it changes.
       {kMgb, kProduct, {product("93009"), product("93009") + "; BUYINGLOCPARTNERNO=0513"}, {Refused(none)}},
       {kMgb, kNothing, {elsewhere, elsewhere + "; " + product("93002"), noPlace, elsewhere + "; " + noPlace + "; " +

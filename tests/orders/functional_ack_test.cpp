@@ -104,13 +104,12 @@ TEST(FunctionalAck, StaysInItsFolderWhateverTheReference) {
 }
 
 TEST(FunctionalAck, IsWrittenWholeOrNotAtAll) {
-  for (const auto& [what, file] :
-       std::map<std::string, std::string>{{"Write", ".TXT.tmp"}, {"Sync", ".TXT.tmp"}, {"Rename", ".TXT"}}) {
+  for (const std::string what : {"Write", "Sync", "Rename"}) {
     for (const Button answer : {Button::kAbort, Button::kIgnore}) {
       SCOPED_TRACE(what);
       Acknowledging trade;
       trade.answer = answer;
-      trade.files.Fail(what, file, run_time::kDiskFull, 2, 1);
+      trade.files.Fail(what, ".TXT", run_time::kDiskFull, 2, 1);
       EXPECT_TRUE(trade.Write());
       EXPECT_FALSE(trade.Write());
       EXPECT_FALSE(trade.Write("4712"));
@@ -125,7 +124,7 @@ TEST(FunctionalAck, IsWrittenWholeOrNotAtAll) {
 TEST(FunctionalAck, IsWrittenOnceWhenTheUserTriesAgain) {
   Acknowledging trade;
   trade.answer = Button::kRetry;
-  trade.files.Fail("Sync", ".TXT.tmp", run_time::kDiskFull);
+  trade.files.Fail("Sync", ".TXT", run_time::kDiskFull);
   EXPECT_TRUE(trade.Write());
   EXPECT_EQ(trade.folder.Read("ack/FA_PO_4711_0603081015.TXT"), kFirst);
 }

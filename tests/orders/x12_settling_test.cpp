@@ -199,9 +199,9 @@ TEST(X12SettlingTest, LosesNothingWhenSettlingFails) {
       // clang-format off
       {"Rename",     "orders.txt", Button::kAbort,  false, true,  0, true,  true},
       {"Delete",     "orders.txt", Button::kAbort,  true,  true,  0, true,  true},
-      {"Write",      "orders.tmp", Button::kIgnore, false, false, 1, true,  false},
-      {"Write",      "orders.tmp", Button::kRetry,  false, true,  1, false, false},
-      {"Sync",       "orders.tmp", Button::kAbort,  true,  false, 1, true,  false},
+      {"Write",      "orders.txt", Button::kIgnore, false, false, 1, true,  false},
+      {"Write",      "orders.txt", Button::kRetry,  false, true,  1, false, false},
+      {"Sync",       "orders.txt", Button::kAbort,  true,  false, 1, true,  false},
       {"Read",       "orders.txt", Button::kAbort,  false, false, 1, true,  false},
       {"Read",       "orders.txt", Button::kIgnore, true,  false, 1, true,  false},
       {"Read",       "orders.txt", Button::kRetry,  false, true,  1, false, false},
@@ -227,7 +227,6 @@ TEST(X12SettlingTest, LosesNothingWhenSettlingFails) {
     EXPECT_TRUE(trade.Import().term);
     EXPECT_THAT(trade.StoredOrders(), ElementsAre("450001/0", "450002/0"));
     EXPECT_FALSE(trade.folder.Has(X12Trade::kFile));
-    EXPECT_FALSE(trade.folder.Has("in/orders.tmp"));
   }
 }
 

@@ -39,7 +39,7 @@ clsTargetBulkPOcsv::clsTargetBulkPOcsv(const Ports& ports) : GtinOrderImporter(k
 
 void clsTargetBulkPOcsv::CheckInner(Posting& posting, const ProductInner& inner) {
   const std::string_view ordered = (*this)[UNITSINNERPACK];
-  if (ordered.empty() || Try([&] { return NumberAtStart(ordered) == inner.InnerQty; })) return;
+  if (ordered.empty() || NumberOf(UNITSINNERPACK) == inner.InnerQty) return;
   posting.checks.RejectProduct("GTIN " + inner.InnerEAN + " inner pack quantity " + NumberText(inner.InnerQty) +
                                " does not match order " + std::string(ordered));
 }

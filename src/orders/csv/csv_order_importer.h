@@ -133,6 +133,7 @@ class CsvOrderImporter : public OrderImporter {
   Next TakeLine(Posting& posting);
   void TakeLocation(Posting& posting);
   Next AddToLocation(Posting& posting, const LineProduct& product);
+  double Sum(const Posting& posting, double before, double quantity);
 
   FieldMap fieldMap_;
   MapHeader mapHeader_;

@@ -118,7 +118,7 @@ bool CsvOrderImporter::SetOrderList(const std::string& path) {
 
 // False when the file cannot be an order file.
 bool CsvOrderImporter::ListTransactions() {
-  lines_->Seek(queue_.Begin());
+  if (!Try([&] { lines_->Seek(queue_.Begin()); })) throw ErrorHandling::LeaveProcedure{};
   std::int64_t lineNo = 0;
   try {
     ListLines(lineNo);

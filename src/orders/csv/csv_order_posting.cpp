@@ -221,8 +221,7 @@ CsvOrderImporter::Next CsvOrderImporter::TakeLine(Posting& posting) {
   LineProduct product;
   if (const auto& line = posting.draft.lines.Find(ordered)) {
     product = {std::string(ordered), line->ProductNo, line->GTIN};
-    const double quantity = LineQuantity(posting);
-    Try([&] { line->Quantity = Plus(line->Quantity, quantity); });
+    line->Quantity = Sum(posting, line->Quantity, LineQuantity(posting));
   } else {
     product = CheckLineProduct(posting);
     const auto added = std::make_shared<OrderLine>();
@@ -250,6 +249,9 @@ CsvOrderImporter::LineProduct CsvOrderImporter::CheckLineProduct(Posting& postin
 // A line that tells style, colour or size keeps the product master up to date.
 void CsvOrderImporter::FitProductMaster() {
   if (line_.Raw(STYLE).empty() && line_.Raw(COLOUR).empty() && line_.Raw(SIZE).empty()) return;
+  // Read for what is wrong with them.
+  NumberOf(WEIGHT);
+  NumberOf(VOLUME);
   AddProduct(*this, {.numberAsRead = line_.Raw(INCOMINGPRODUCTNO),
                      .style = line_[STYLE],
                      .colour = line_[COLOUR],
@@ -268,6 +270,15 @@ LineClaims CsvOrderImporter::Claims(std::string_view productNo) const {
           .cost = line_[UNITPRICE],
           .retail = line_[RETAILUNITPRICE],
           .sku = line_[SKUPRODUCTKEYCODE]};
+}
+
+double CsvOrderImporter::Sum(const Posting& posting, double before, double quantity) {
+  try {
+    return Plus(before, quantity);
+  } catch (const RunTimeError&) {
+    throw Unreadable{LineText(posting.lineNo) + ": the quantities of product " + std::string(line_[INCOMINGPRODUCTNO]) +
+                     " add up beyond all numbers"};
+  }
 }
 
 double CsvOrderImporter::NumberOf(OrderField field) {
@@ -323,8 +334,8 @@ CsvOrderImporter::Next CsvOrderImporter::AddToLocation(Posting& posting, const L
   added->BuyingLocn = posting.buyingLocn;
   FillLocationLine(posting, *added);
   if (there) {
-    Try([&] { there->Quantity = Plus(there->Quantity, added->Quantity); });
-    Try([&] { there->AllocateQty = Plus(there->AllocateQty, added->AllocateQty); });
+    there->Quantity = Sum(posting, there->Quantity, added->Quantity);
+    there->AllocateQty = Sum(posting, there->AllocateQty, added->AllocateQty);
   } else {
     posting.draft.locnLines.Add(added, key);
   }

@@ -141,7 +141,7 @@ bool CsvOrderImporter::StillStandsAt(std::uint64_t position, const ListedOrder& 
   if (!ReadLine(line)) return false;
   line_.Read(line.text);
   line_.Join(values_.transactionKey, key);
-  return OrderNumber(number) == entry.PONo && key == entry.Controls();
+  return OrderNumber(number) == entry.PONo && key == entry.Controls() && IsOurs();
 }
 
 // Of the lines up to the next row's, another company's and those that came since the listing stay.
@@ -154,7 +154,8 @@ void CsvOrderImporter::CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t beg
     if (inside) line_.Read(line.text, line_.ColumnsFor(kAddresses));
     // Some mailboxes leave segments of an interchange between the lines.
     const bool envelope = IsEnvelopeSegment(line.text);
-    const bool goes = envelope ? values_.deletesEnvelopes : TrimBlanks(line.text).empty() || IsOurs();
+    const bool nobodys = inside && line_[kAddresses[0]].empty() && line_[kAddresses[1]].empty();
+    const bool goes = envelope ? values_.deletesEnvelopes : nobodys || IsOurs();
     if (!inside || !goes) Keep(rewrite, line.raw);
   }
   if (!rewrite.Empty()) rewrite.KeepRange({lines.Position(), queue_.File().Length() + 1});

@@ -59,7 +59,7 @@ inline constexpr OrderRule kUsualStoredOrder[] = {
     {                                        .number = kRejection, .message = words::kAlreadyExists},
 };
 inline constexpr OrderRule kRefuseCancellation[] = {
-    {.purpose = "01 1", .number = kRejection, .message = words::kCancelOfNothing},
+    {.purpose = "01 1", .number = kRejection, .message = words::kCancelOfNothing, .fate = Fate::kCancel},
 };
 // clang-format on
 

@@ -90,6 +90,7 @@ class X12OrderImporter : public OrderImporter {
   void CompleteEntry(ListedOrder& entry);
   bool ProcessFA(const Group& group);
   std::string SegmentText() const;
+  Unreadable Fault(const RunTimeError& error) const;
   // Takes the file's next segment in hand. False at its end. Raises RunTimeError.
   bool ReadSegment();
   SegmentReader& Segments();

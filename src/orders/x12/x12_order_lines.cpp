@@ -94,6 +94,9 @@ void X12OrderImporter::NeedLine(const Posting& posting) const {
 X12OrderImporter::Next X12OrderImporter::TakeStores(Posting& posting) {
   NeedLine(posting);
   for (int n = kFirstStore; n <= kLastStore && segment_.PosBegSplat(n) != 0; n += 2) {
+    if (segment_.PosBegSplat(n + 1) == 0) {
+      throw Unreadable{SegmentText() + ": store " + Element(n, {ElementForm::kLast}) + " has no quantity"};
+    }
     const std::string store = Element(n);
     if (posting.n1 == values_.directToStore) {
       CheckShipTo(posting, store);
@@ -102,9 +105,6 @@ X12OrderImporter::Next X12OrderImporter::TakeStores(Posting& posting) {
     }
     if (values_.rechecksStores) posting.locationLookedAt.clear();
     CheckBuyingLocn(posting, store, true, values_.storeWord);
-    if (segment_.PosBegSplat(n + 1) == 0) {
-      throw Unreadable{SegmentText() + ": store " + store + " has no quantity"};
-    }
     const double quantity = NumberOf(posting, n + 1, ElementOrEnd(n + 1, values_.quantityForm), true);
     if (AddToLocation(posting, quantity) == Next::kEnd) return Next::kEnd;
   }

@@ -99,7 +99,7 @@ bool X12OrderImporter::WalkFile() {
   X12Walk walk = Walk();
   Group group;
   ListedOrder entry;
-  Segments().Seek(queue_.Begin());
+  if (!Try([&] { Segments().Seek(queue_.Begin()); })) throw ErrorHandling::LeaveProcedure{};
   while (NextSegment()) {
     const X12Walk::Event event = walk.Take(segment_);
     if (event == X12Walk::Event::kGroupEnds && !ProcessFA(group)) return false;
@@ -150,7 +150,7 @@ ListedOrder X12OrderImporter::BeginEntry(const Group& group) {
   try {
     entry.TransactionCtl = TrimBlanks(segment_.Rest(8).substr(0, values_.longestControl));
   } catch (const RunTimeError& error) {
-    entry.fault = AsPartOfSentence(error.Description());
+    entry.fault = Fault(error).why;
   }
   return entry;
 }
@@ -163,7 +163,7 @@ void X12OrderImporter::CompleteEntry(ListedOrder& entry) {
   } catch (const Unreadable& fault) {
     entry.fault = fault.why;
   } catch (const RunTimeError& error) {
-    entry.fault = AsPartOfSentence(error.Description());
+    entry.fault = Fault(error).why;
   }
 }
 

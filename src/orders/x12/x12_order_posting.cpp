@@ -1,5 +1,6 @@
 // Posting one transaction of an X12 order file.
 #include <algorithm>
+#include <cctype>
 
 #include "frame/delimited.h"
 #include "orders/order_export.h"
@@ -25,6 +26,9 @@ std::int32_t X12OrderImporter::Process(std::int32_t a_lRowNum, ErrorList& vtErro
       orderId = PostTransaction(posting) == Next::kEnd ? posting.result : Store(posting);
     } catch (const Unreadable& fault) {
       Refuse(posting, fault);
+    } catch (const RunTimeError& error) {
+      // A segment too long to have positions, asked for one.
+      Refuse(posting, Fault(error));
     }
   });
 }
@@ -187,11 +191,19 @@ std::string X12OrderImporter::SegmentText() const {
          std::to_string(segment_.Begin());
 }
 
+// What is wrong with the segment in hand. One that is too long has no positions to count by.
+Unreadable X12OrderImporter::Fault(const RunTimeError& error) const {
+  if (error.Number() == run_time::kOverflow) return {SegmentText() + " is too long to be read"};
+  std::string text = error.Description();
+  if (!text.empty()) text.front() = static_cast<char>(std::tolower(static_cast<unsigned char>(text.front())));
+  return {text};
+}
+
 std::string X12OrderImporter::Element(int n, ElementForm form) const {
   try {
     return std::string(segment_.Read(n, form));
   } catch (const RunTimeError& error) {
-    throw Unreadable{AsPartOfSentence(error.Description())};
+    throw Fault(error);
   }
 }
 
