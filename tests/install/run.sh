@@ -1,7 +1,7 @@
 #!/bin/sh
 # run.sh prefix|cmake|pkg-config|readme BUILD - installs the build BUILD under a prefix of its own; or builds the programs
 # in the folders here against what stands there, found by its CMake package or through pkg-config, and runs them; or
-# holds the program that the README shows against the one that is built.
+# holds the program and the output that the README shows against those here.
 set -eu
 step=$1 build=$2
 here=$(cd "$(dirname "$0")" && pwd)
@@ -52,15 +52,17 @@ turned_away_too='4500012352 2006-03-07 000000481/481/0004  NOT DONE
    ...Cannot process PO 4500012352, ship to location 0130 does not exist.
    PO 4500012352 import incomplete.'
 
-# The program with the database: a run, a second one over what is left, and two that cannot be.
-database() {
-  begin database
-  check 'the first run' "4500012345 2006-03-06 000000481/481/0001  posted, id 1
+first_run="4500012345 2006-03-06 000000481/481/0001  posted, id 1
    PO 4500012345 import completed.
 $turned_away
 4500012351 2006-03-07 000000481/481/0003  posted, id 2
    PO 4500012351 import completed.
-$turned_away_too
+$turned_away_too"
+
+# The program with the database: a run, a second one over what is left, and two that cannot be.
+database() {
+  begin database
+  check 'the first run' "$first_run
 status 1" "$(answers "$1")"
   check 'the rest of the file' '4500012346 4500012352' "$(orders_in orders.csv)"
   check 'the backup' '4500012345 4500012351' "$(orders_in posted.csv)"
@@ -91,10 +93,9 @@ status 1' "$(answers "$1")"
   check 'the rest of the file' '4500012346 4500012352' "$(orders_in orders.csv)"
 }
 
-# readme LANGUAGE FILE: the README's one block in that language is the file.
-readme() {
-  block=$(awk -v from="\`\`\`$1" '$0 == from { inside = 1; next } $0 == "```" { inside = 0 } inside' "$project/README.md")
-  check "the $1 block of README.md" "$(cat "$here/$2")" "$block"
+# block LINE: what the README has between that line and the end of the block.
+block() {
+  awk -v from="$1" '$0 == from { inside = 1; next } $0 == "```" { inside = 0 } inside' "$project/README.md"
 }
 
 case $step in
@@ -123,8 +124,9 @@ pkg-config)
   memory "$work/list_orders"
   ;;
 readme)
-  readme cpp database/main.cpp
-  readme cmake database/CMakeLists.txt
+  check "the README's program" "$(cat "$here/database/main.cpp")" "$(block '```cpp')"
+  check "the README's CMakeLists.txt" "$(cat "$here/database/CMakeLists.txt")" "$(block '```cmake')"
+  check "the README's output" "$first_run" "$(block '$ build/import_orders')"
   ;;
 *)
   echo "usage: run.sh prefix|cmake|pkg-config|readme BUILD" >&2
