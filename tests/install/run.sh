@@ -17,10 +17,11 @@ fail() {
 
 # check NAME EXPECTED ACTUAL
 check() {
-  [ "$2" = "$3" ] || fail "$1 should be:
-$2
-but is:
-$3"
+  [ "$2" != "$3" ] || return 0
+  mkdir -p "$work"
+  printf '%s\n' "$2" >"$work/expected"
+  printf '%s\n' "$3" >"$work/actual"
+  diff -u "$work/expected" "$work/actual" >&2 || fail "$1 is not as expected"
 }
 
 # An empty folder with the sample's order file and map, and the current one from here on.
