@@ -230,6 +230,28 @@ TEST(MemoryHostTest, TellsWhyItRefuses) {
   EXPECT_EQ(host.Records().NativeError(), 0);
 }
 
+TEST(MemoryHostTest, WalksAroundWhatChangesMeanwhileAndGivesNoIdTwice) {
+  MemoryHost host;
+  Log first, second, third, late;
+  host.BeginTrans();
+  EXPECT_TRUE(Add(host.Records(), late));
+  host.RollbackTrans();
+  EXPECT_TRUE(Add(host.Records(), first) && Add(host.Records(), second) && Add(host.Records(), third));
+  std::vector<Log> seen;
+  seen.reserve(4);
+  host.Records().Select(Log::kType, kEveryRecord, &first, [&]() -> void* {
+    if (seen.empty()) {
+      late.LogId = 0;
+      EXPECT_TRUE(Delete(host.Records(), second) && Add(host.Records(), late));
+    }
+    return &seen.emplace_back();
+  });
+  std::string ids;
+  for (const Log& log : seen) ids += std::to_string(log.LogId) + " ";
+  EXPECT_EQ(ids, "2 4 ");
+  EXPECT_EQ(late.LogId, 5);
+}
+
 // An order that its store gives up in part only.
 TEST(StoreHostTest, LeavesAnOrderWholeThatItCannotDelete) {
   Bundled bundled;
