@@ -12,10 +12,10 @@
 #include <string_view>
 #include <vector>
 
-#include "../fuzz/memory_host.h"
 #include "partnerkit/catalogue.h"
 #include "partnerkit/drawing.h"
 #include "partnerkit/label.h"
+#include "partnerkit/memory_host.h"
 #include "partnerkit/platform.h"
 #include "partnerkit/spooling.h"
 #include "stopwatch.h"
@@ -24,7 +24,7 @@ namespace {
 
 using namespace partnerkit;
 
-class Warehouse : public fuzz::MemoryHost {
+class Warehouse : public MemoryHost {
  public:
   std::optional<std::string> Setting(std::string_view name) override {
     if (name == "PrinterLanguage") return "LBXII";

@@ -1,9 +1,9 @@
-# What `cmake --install` puts in place: the library, its headers, the program, and what CMake and pkg-config projects find
+# What `cmake --install` puts in place: the library, the bundled host, their headers, the program, and what CMake and pkg-config projects find
 # it by. Both descriptions go by their own place, so that an installed tree can be moved or installed under another prefix.
 include(CMakePackageConfigHelpers)
 
 set(package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/partnerkit)
-install(TARGETS partnerkit EXPORT partnerkitTargets)
+install(TARGETS partnerkit partnerkit_host EXPORT partnerkitTargets)
 install(TARGETS partnerkit_program)
 install(DIRECTORY include/ ${PROJECT_BINARY_DIR}/include/ DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}
   FILES_MATCHING PATTERN "*.h")
@@ -17,5 +17,7 @@ install(FILES
 
 cmake_path(RELATIVE_PATH CMAKE_INSTALL_PREFIX
   BASE_DIRECTORY ${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig OUTPUT_VARIABLE pc_to_prefix)
-configure_file(cmake/partnerkit.pc.in partnerkit.pc @ONLY)
-install(FILES ${PROJECT_BINARY_DIR}/partnerkit.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
+foreach(package IN ITEMS partnerkit partnerkit-host)
+  configure_file(cmake/${package}.pc.in ${package}.pc @ONLY)
+  install(FILES ${PROJECT_BINARY_DIR}/${package}.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
+endforeach()

@@ -86,10 +86,10 @@ class X12Run : private ImportRun {
 
   void CheckStore() {
     std::set<std::string> found;
-    host_.Records().ForEach<Order>([&](const Order& order) {
-      Check(found.insert(order.PONo).second, "an order is stored once");
-      Check(order.Status == 0 || faulty_.contains(order.PONo), "a stored order is complete, or told to have errors");
-    });
+    for (const auto& order : Select(host_.Records(), kEveryRecord, Order())) {
+      Check(found.insert(order->PONo).second, "an order is stored once");
+      Check(order->Status == 0 || faulty_.contains(order->PONo), "a stored order is complete, or told to have errors");
+    }
   }
 
   void CheckFile(const std::string& before, const RowTable& rows, const std::vector<Outcome>& outcomes) {

@@ -7,8 +7,8 @@
 #include <vector>
 
 #include "memory_files.h"
-#include "memory_host.h"
 #include "partnerkit/catalogue.h"
+#include "partnerkit/memory_host.h"
 #include "partnerkit/platform.h"
 #include "platform/clocks.h"
 #include "subject.h"
@@ -67,7 +67,9 @@ class ImportRun {
   }
   std::int32_t IdOf(const std::string& number) {
     std::int32_t id = 0;
-    host_.Records().ForEach<Order>([&](const Order& order) { id = order.PONo == number ? order.OrderId : id; });
+    for (const auto& order : Select(host_.Records(), kEveryRecord, Order())) {
+      if (order->PONo == number) id = order->OrderId;
+    }
     return id;
   }
 

@@ -160,17 +160,17 @@ class OrderRun : private ImportRun {
 
   void CheckStore() {
     std::set<std::string> found;
-    host_.Records().ForEach<Order>([&](const Order& order) {
-      Check(found.insert(order.PONo).second, "an order is stored once");
-      const auto wanted = stored_.find(order.PONo);
-      Check(wanted != stored_.end() && wanted->second.id == order.OrderId, "the store holds what was posted only");
-      Check(order.Status == (wanted->second.faulty ? 9 : 0), "a stored order is complete, or told to have errors");
+    for (const auto& order : Select(host_.Records(), kEveryRecord, Order())) {
+      Check(found.insert(order->PONo).second, "an order is stored once");
+      const auto wanted = stored_.find(order->PONo);
+      Check(wanted != stored_.end() && wanted->second.id == order->OrderId, "the store holds what was posted only");
+      Check(order->Status == (wanted->second.faulty ? 9 : 0), "a stored order is complete, or told to have errors");
       OrderLocnLine probe;
-      probe.OrderId = order.OrderId;
+      probe.OrderId = order->OrderId;
       Check(
           TheSubject().rules.linesMayNotCount || partnerkit::Count(host_.Records(), OrderLocnLine::kByOrder, probe) > 0,
           "a stored order has lines");
-    });
+    }
     Check(found.size() == stored_.size(), "the store holds all that was posted");
   }
 

@@ -11,8 +11,8 @@
 
 #include "host/sql_options.h"
 #include "host/sql_store.h"
+#include "partnerkit/database_host.h"
 #include "partnerkit/records.h"
-#include "partnerkit/store.h"
 
 namespace partnerkit::host {
 
@@ -24,7 +24,7 @@ bool DropThreadGuards();
 // Changes are grouped as SqlSession tells: `Commit` makes them durable, and so do `Close` and the destructor, since
 // what a failed posting leaves behind is kept for the next run to find. Only a killed program loses what it did not
 // commit. While changes wait for their commit, other programs on the same database wait too.
-class SqlHost : public System {
+class SqlHost : public DatabaseHost {
  public:
   // Opens the database and makes or updates its tables. `url` is a file path, with or without "sqlite3://" before it.
   // Raises RunTimeError (run_time::kDatabase) with a text that names the database and the cause.
@@ -50,15 +50,15 @@ class SqlHost : public System {
   bool StampPack(std::int32_t packId, std::int32_t noticeId) override;
 
   // Raises RunTimeError when the database cannot be written to, or is locked by another program beyond the time-out.
-  void CheckWritable();
+  void CheckWritable() override;
   // Commits what waits for it. Raises RunTimeError.
-  void Close();
+  void Close() override;
 
   // The host's settings, the members of `System` by name. They raise RunTimeError. One that was asked for is kept, so
   // that a change by another program counts from the next opening on.
   std::optional<std::string> Setting(std::string_view name) override;
-  std::vector<std::pair<std::string, std::string>> Settings();
-  void SetSetting(std::string_view name, std::string_view value);
+  std::vector<std::pair<std::string, std::string>> Settings() override;
+  void SetSetting(std::string_view name, std::string_view value) override;
 
   SqlSession& Session();
 

@@ -1,8 +1,10 @@
-// Which packs wait for a notice, and what is left to pack of their orders.
+// Which packs wait for a notice, and what is left to pack of their orders: as the bundled host answers by statements of
+// its own, and as any other does from its records.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "support/packed_trade.h"
+#include "support/record_host.h"
 
 namespace partnerkit::testing {
 namespace {
@@ -10,7 +12,23 @@ namespace {
 std::string Waiting(PackedTrade& trade, std::string_view vendor = "ACME", std::string_view partner = "MGB") {
   std::string all;
   for (const auto& pack : trade.system->PacksToCompile(vendor, partner)) all += pack->SSCC.value_or("null") + " ";
+  std::string fromRecords;
+  RecordHost other(*trade.system);
+  for (const auto& pack : other.PacksToCompile(vendor, partner)) fromRecords += pack->SSCC.value_or("null") + " ";
+  EXPECT_EQ(fromRecords, all);
   return all;
+}
+
+bool Complete(PackedTrade& trade, std::int32_t order) {
+  const bool complete = trade.system->OrderComplete(order);
+  EXPECT_EQ(RecordHost(*trade.system).OrderComplete(order), complete);
+  return complete;
+}
+
+bool OpenOn(PackedTrade& trade, std::int32_t shipment, std::int32_t order) {
+  const bool open = trade.system->OrderOpenOnShipment(shipment, order);
+  EXPECT_EQ(RecordHost(*trade.system).OrderOpenOnShipment(shipment, order), open);
+  return open;
 }
 
 TEST(PacksToCompileTest, StandByShipmentOrderShipToAndId) {
@@ -61,25 +79,24 @@ TEST(PacksToCompileTest, TellWhatIsLeftToPackByTheNotedQuantityOrThePackLines) {
     trade.AddPack({}, {{"93001", each.packed / 2}, {"93001", each.packed / 2}});
     trade.Sql("UPDATE tbOrderLocnLine SET PackedQty = " + std::to_string(each.noted) +
               "; UPDATE tbPSlipLine SET PackedQty = " + std::to_string(each.noted));
-    EXPECT_EQ(trade.system->OrderComplete(1), each.complete);
-    EXPECT_EQ(trade.system->OrderOpenOnShipment(1, 1), each.open);
+    EXPECT_EQ(Complete(trade, 1), each.complete);
+    EXPECT_EQ(OpenOn(trade, 1, 1), each.open);
   }
 }
 
 TEST(PacksToCompileTest, TellOfEachOrderAndShipmentByItself) {
   PackedTrade trade(kMgb);
   trade.AddPack();
-  EXPECT_TRUE(trade.system->OrderOpenOnShipment(1, 1));
-  EXPECT_FALSE(trade.system->OrderOpenOnShipment(2, 1));
-  EXPECT_FALSE(trade.system->OrderOpenOnShipment(1, 2));
+  EXPECT_TRUE(OpenOn(trade, 1, 1));
+  EXPECT_FALSE(OpenOn(trade, 2, 1));
+  EXPECT_FALSE(OpenOn(trade, 1, 2));
   trade.CompleteOrder();
-  EXPECT_TRUE(trade.system->OrderComplete(1));
-  EXPECT_FALSE(trade.system->OrderComplete(2)) << "without lines";
+  EXPECT_TRUE(Complete(trade, 1));
+  EXPECT_FALSE(Complete(trade, 2)) << "without lines";
   trade.Sql("INSERT INTO tbOrderLocnLine(OrderId, Quantity) VALUES(1, 1)");
-  EXPECT_FALSE(trade.system->OrderComplete(1));
+  EXPECT_FALSE(Complete(trade, 1));
 }
 
-// By the host's own statement, and by the records of any other.
 TEST(PacksToCompileTest, AreStampedOnce) {
   for (const bool own : {true, false}) {
     PackedTrade trade(kMgb);
