@@ -75,7 +75,7 @@ void WorkQueue::Rewrite::Begin() {
     out_.reset();
     files.Delete(draft_);
   }
-  if (files.Exists(temporary_) && !SaysNothing(temporary_)) MoveAside(temporary_);
+  if (files.Exists(temporary_) && !MayStay(temporary_)) MoveAside(temporary_);
   out_ = files.OpenDraft(queue_.target_, draft_);
   if (!out_->TakeRights(queue_.File().Rights(), Take::kAll)) {
     tell_("The owner or the group of " + queue_.path_ + " cannot be kept: it is rewritten as a file of another's");
@@ -84,7 +84,7 @@ void WorkQueue::Rewrite::Begin() {
 
 // An earlier run may have left it with envelopes of nothing, or a mailbox have just begun to write to it: no reason to
 // move it.
-bool WorkQueue::Rewrite::SaysNothing(const std::string& path) {
+bool WorkQueue::Rewrite::MayStay(const std::string& path) {
   std::vector<char> block(64 * 1024);
   try {
     const std::unique_ptr<InputFile> file = queue_.files_.OpenInput(path, Share::kDenyWrite);
@@ -96,8 +96,9 @@ bool WorkQueue::Rewrite::SaysNothing(const std::string& path) {
       rest.remove_prefix(std::min(rest.size(), segment.size() + 1));
     }
     return true;
-  } catch (const RunTimeError&) {
-    return false;
+  } catch (const RunTimeError& error) {
+    // A mailbox that holds it is at work on it.
+    return error.Number() == run_time::kPermissionDenied;
   }
 }
 

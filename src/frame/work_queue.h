@@ -123,7 +123,7 @@ class WorkQueue {
     void MoveAside(const std::string& path);
     const std::string& Leave(const std::string& name);
     [[noreturn]] void Fail(const RunTimeError& cause, const std::string& what);
-    bool SaysNothing(const std::string& path);
+    bool MayStay(const std::string& path);
 
     WorkQueue& queue_;
     Tell tell_;

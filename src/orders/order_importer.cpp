@@ -119,7 +119,7 @@ void OrderImporter::ForgetUnsettled() {
   unsettled_.clear();
 }
 
-void OrderImporter::NoteBackedUp(const std::vector<std::int32_t>& orders) {
+void OrderImporter::NoteBackedUp(std::span<const std::int32_t> orders) {
   for (const std::int32_t orderId : orders) {
     UnsettledOrder note;
     note.OrderId = orderId;
@@ -196,12 +196,13 @@ OrderImporter::Next OrderImporter::SettleStoredOrder(OrderPosting& posting, Orde
 // A run that stored the order and was stopped before the file was settled: its lines go where those of a posted order
 // do.
 bool OrderImporter::IsStoredEarlier(OrderPosting& posting, const Order& stored) {
+  if (unsettled_.contains(stored.OrderId)) return false;  // it comes twice
   UnsettledOrder note;
   note.OrderId = stored.OrderId;
   if (!Try([&] { return partnerkit::Load(Records(), note); })) return false;
   posting.log.Note(kRejection, words::kAlreadyExists.With(posting.entry.PONo));
   posting.entry.OrderId = note.BackedUp ? 0 : stored.OrderId;
-  unsettled_.push_back(stored.OrderId);
+  unsettled_.insert(stored.OrderId);
   MarkPosted(posting.entry);
   return true;
 }
@@ -351,7 +352,7 @@ std::int32_t OrderImporter::Store(OrderPosting& posting, std::optional<std::stri
   UnsettledOrder note = NoteOf(posting.draft.header.OrderId);
   if (!orders::MakeDurable(*this, posting.draft, complete, note)) return 0;
   entry.OrderId = posting.draft.header.OrderId;
-  unsettled_.push_back(entry.OrderId);
+  unsettled_.insert(entry.OrderId);
   MarkPosted(entry);
   Export(posting);
   posting.log.Note(kInformation, (complete ? words::kImportCompleted : words::kImportWithErrors).With(entry.PONo));

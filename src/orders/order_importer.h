@@ -84,7 +84,7 @@ class OrderImporter : public TranslatorBase {
   // Behind settling: the file holds them no longer.
   void ForgetUnsettled();
   // The backup has the lines of these.
-  void NoteBackedUp(const std::vector<std::int32_t>& orders);
+  void NoteBackedUp(std::span<const std::int32_t> orders);
 
   // --- Values of lines and segments
   // The number at the front of `text`, which `place` gives as `name` ("line 17", "ORDERQUANTITY"). One that isn't a
@@ -142,7 +142,7 @@ class OrderImporter : public TranslatorBase {
   WorkQueue queue_;
   std::string fileName_;
   std::vector<ListedOrder> listed_;
-  std::vector<std::int32_t> unsettled_;  // orders of this file whose records ForgetUnsettled drops
+  std::set<std::int32_t> unsettled_;  // orders of this file whose records ForgetUnsettled drops
 
  private:
   bool IsStoredEarlier(OrderPosting& posting, const Order& stored);

@@ -131,12 +131,12 @@ bool ClearDraft(const std::string& name) {
   }
 }
 
-// Nothing when the name is another's.
-std::optional<Draft> MakeDraftNamed(const std::string& name) {
+// Nothing when the name is another's. What goes wrong is told of the file that it is to be a draft of.
+std::optional<Draft> MakeDraftNamed(const std::string& name, const std::string& native) {
   for (int attempt = 0; attempt < kOpenAttempts; ++attempt) {
     Descriptor made = OpenWith(name, O_RDWR | O_APPEND | kMake);
     if (!made.IsOpen()) {
-      if (errno != EEXIST) RaiseCause(errno, name, run_time::kPathAccess);
+      if (errno != EEXIST) RaiseCause(errno, native, run_time::kPathAccess);
       if (!ClearDraft(name)) return std::nullopt;
       continue;
     }
@@ -171,7 +171,7 @@ Draft MakeDraft(const std::string& native) {
   const std::size_t begin = slash == std::string::npos ? 0 : slash + 1;
   const std::string stem = native.substr(0, begin) + "." + native.substr(begin, kLongestPart) + ".partnerkit-";
   for (int number = 1; number <= kMostDrafts; ++number) {
-    if (auto draft = MakeDraftNamed(stem + std::to_string(number))) return *std::move(draft);
+    if (auto draft = MakeDraftNamed(stem + std::to_string(number), native)) return *std::move(draft);
   }
   Raise(run_time::kPermissionDenied, native, "Every name for a draft of the file is in use");
 }

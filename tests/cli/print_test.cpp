@@ -87,8 +87,8 @@ TEST_F(PrintLabels, APreviewCanBeScanned) {
   };
   expectFailed("901", "label.gif", 2, "--out label.gif: wants a name that ends in .png, .pdf or .svg");
   expectFailed("77", "none.png", 1, "pack 77: no such pack in " + Workspace());
-  expectFailed("901", "no/none.png", 1, "Path not found: no/none.png.draft: No such file or directory");
-  EXPECT_FALSE(folder.Has("none.png") || folder.Has("none.png.draft"));
+  expectFailed("901", "no/none.png", 1, "Path not found: no/none.png: No such file or directory");
+  EXPECT_FALSE(folder.Has("none.png") || folder.Has("none.png"));
 }
 
 TEST_F(PrintLabels, WhatCannotBePrintedIsTold) {

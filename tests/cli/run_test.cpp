@@ -152,16 +152,16 @@ TEST_F(RunDocument, TellsThatARunCannotStart) {
   EXPECT_EQ(json::parse(ran.out)["rows"], json::array());
 }
 
-// The temporary file cannot be made where a folder bears its name.
+// The note of what goes to the backup cannot be made where a folder bears its name.
 TEST_F(RunDocument, TellsAFaultOnOneLineAndKeepsTheFile) {
-  std::filesystem::create_directories(folder / "inbox/orders.tmp/in the way");
+  std::filesystem::create_directories(folder / "backup/po.csv.pending/in the way");
   const Ran ran = Run({"--json", "process", "1", "inbox/orders.csv", "--row", "0"});
   EXPECT_EQ(ran.status, 1);
   EXPECT_THAT(ran.err, ::testing::StartsWith("partnerkit: TLE error - program error #75 ("));
   EXPECT_EQ(std::ranges::count(ran.err, '\n'), 1) << ran.err;
   EXPECT_EQ(json::parse(ran.out)["results"][0]["result"], 1);
   EXPECT_EQ(Orders(), Sample("orders.csv"));
-  std::filesystem::remove_all(folder / "inbox/orders.tmp");
+  std::filesystem::remove_all(folder / "backup/po.csv.pending");
   EXPECT_EQ(Run({"process", "1", "inbox/orders.csv", "--row", "0"}).status, 1);
   EXPECT_EQ(Orders().find("4500012345"), std::string::npos);
 }

@@ -127,7 +127,7 @@ TEST_F(FolderTest, WaitsForAnotherProgramAndTidiesUpAfterAKilledOne) {
   flock(held, LOCK_EX);
   EXPECT_EQ(ErrorOf([&] { Deliver("job"); }),
             "70 Permission denied: " + folder / "" + ": Another program has held the folder for 0.3 s");
-  folder.Write(".partnerkit-77.draft", "half a j");
+  folder.Write(".job.partnerkit-1", "half a j");
   flock(held, LOCK_UN);
   close(held);
   EXPECT_EQ(Deliver("job"), "0001.prn");

@@ -39,11 +39,12 @@ bool CsvOrderImporter::SettleFile() {
   WorkQueue::Rewrite rewrite(queue_, TellOfRewrite());
   std::vector<ByteRange> posted;
   if (!Try([&] { DealOut(rewrite, posted); })) return false;
-  if (backup_.IsOpen() && !Try([&] { backup_.Append(queue_.File(), queue_.Path(), posted, unsettled_); })) return false;
+  const std::vector<std::int32_t> orders(unsettled_.begin(), unsettled_.end());
+  if (backup_.IsOpen() && !Try([&] { backup_.Append(queue_.File(), queue_.Path(), posted, orders); })) return false;
   if (!Try([&] { rewrite.Claim(); })) return false;
   if (PutInPlace([&] { rewrite.Replace(); })) {
     ForgetUnsettled();
-  } else if (backup_.IsOpen() && !Try([&] { NoteBackedUp(unsettled_); })) {
+  } else if (backup_.IsOpen() && !Try([&] { NoteBackedUp(orders); })) {
     return false;
   }
   return Try([&] { backup_.Settle(); });

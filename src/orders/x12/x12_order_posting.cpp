@@ -66,6 +66,7 @@ X12OrderImporter::Next X12OrderImporter::ReadTransaction(Posting& posting) {
       next = TakeBeginning(posting);
     } else if (tag == "CTT") {
       posting.complete = posting.begun;
+      if (!posting.complete) return CutShort(posting);
       return Distribute(posting);
     } else if (EndsTransaction(tag)) {
       return CutShort(posting);
