@@ -166,12 +166,36 @@ void SqlSession::Commit() {
   if (state_ == State::kExplicit) Raise("commit within a transaction");
   if (!loss_.empty()) TellLoss();
   if (state_ == State::kImplicit) CommitOpen();
+  else if (rider_ != nullptr && rider_->Waits()) CommitRider();
+}
+
+bool SqlSession::CommitRider() {
+  if (state_ != State::kNone || rider_ == nullptr) return false;
+  try {
+    Run(begin_, dialect_->beginWrite);
+    WriteAndCommit();
+  } catch (const soci::soci_error& error) {
+    Failed(error);
+    RollBackOpen();
+    return false;
+  }
+  return true;
+}
+
+void SqlSession::Recover() {
+  RollbackExplicit();
+  try {
+    Commit();
+  } catch (const RunTimeError&) {
+    ForgetToldLoss();
+  }
 }
 
 void SqlSession::Begin() {
   if (state_ == State::kExplicit) Raise("a transaction is open already");
   ForgetToldLoss();
-  Commit();
+  if (!loss_.empty()) TellLoss();
+  if (state_ == State::kImplicit) CommitOpen();
   Guarded([this] { Run(begin_, dialect_->beginWrite); });
   state_ = State::kExplicit;
 }
@@ -193,24 +217,32 @@ bool SqlSession::InTransaction() { return sqlite_api::sqlite3_get_autocommit(Con
 
 void SqlSession::Close() {
   RollbackExplicit();
-  if (!lossTold_) Commit();
+  ForgetToldLoss();
+  Commit();
 }
 
 void SqlSession::CommitOpen() {
   try {
-    Run(commit_, "COMMIT");
+    WriteAndCommit();
   } catch (const soci::soci_error& error) {
     Failed(error);
     NoteLoss(MessageOf(error));
     TellLoss();
   }
+}
+
+void SqlSession::WriteAndCommit() {
+  if (rider_ != nullptr) rider_->BeforeCommit();
+  Run(commit_, "COMMIT");
   state_ = State::kNone;
+  if (rider_ != nullptr) rider_->Committed();
   Succeeded();
   GiveTurn();
 }
 
 void SqlSession::RollBackOpen() noexcept {
   state_ = State::kNone;
+  if (rider_ != nullptr) rider_->TakenBack();
   if (!InTransaction()) return;
   try {
     Run(rollback_, "ROLLBACK");
@@ -240,9 +272,14 @@ void SqlSession::TellLoss() {
 void SqlSession::Failed(const soci::soci_error& error) {
   const int code = sqlite_api::sqlite3_extended_errcode(Connection());
   nativeError_ = code == SQLITE_OK ? SQLITE_ERROR : code;
+  if (NewestIsFault()) {
+    ++faults_;
+    lastFault_ = MessageOf(error);
+  }
   if (state_ == State::kNone || InTransaction()) return;
   NoteLoss(MessageOf(error));
   if (state_ == State::kImplicit) state_ = State::kNone;
+  if (rider_ != nullptr) rider_->TakenBack();
 }
 
 std::string SqlSession::MessageOf(const soci::soci_error& error) const {
@@ -270,5 +307,17 @@ void SqlSession::GiveTurn() {
 }
 
 bool SqlSession::ForbiddenByConstraint() const { return (nativeError_ & 0xff) == SQLITE_CONSTRAINT; }
+
+bool SqlSession::NewestIsFault() const {
+  switch (nativeError_ & 0xff) {
+    case SQLITE_OK:
+    case SQLITE_CONSTRAINT:
+    case SQLITE_TOOBIG:
+    case SQLITE_MISMATCH:
+      return false;
+    default:
+      return true;
+  }
+}
 
 }  // namespace partnerkit::host
