@@ -141,12 +141,11 @@ class Run {
     const std::int32_t deletedBefore = host_.OrdersDeleted();
     const std::int32_t id = translator_->Process(row, result.errorLog);
     result.result = id;
-    const bool orderGone = host_.OrdersDeleted() > deletedBefore;
     // What a row leaves uncommitted must not be lost behind a later row that was settled by it.
     if (!StoreFailed() && workspace_.Host().HasChanges()) CommitHost();
-    // A deletion may have been taken back.
-    const bool gone = orderGone && !StoreFailed();
-    result.outcome = OutcomeOf(id, gone, SaysOnlyWarnings(result.errorLog));
+    // A failing store may have taken the deletion back.
+    const bool orderGone = host_.OrdersDeleted() > deletedBefore && !StoreFailed();
+    result.outcome = OutcomeOf(id, orderGone, SaysOnlyWarnings(result.errorLog));
     if (result.outcome == Outcome::kTurnedAway) status_ = kTurnedAway;
     report_.results.push_back(std::move(result));
   }
@@ -159,16 +158,16 @@ class Run {
     progress_.Clear();
     workspace_.Host().Recover();
     status_ = kTurnedAway;
-    const std::string left =
-        untried > 0 ? Counted(untried, "row", "rows") + " not tried" : "the last row may have failed";
-    command_.Say(file_ + ": " + left + ", for the store failed: " + workspace_.Host().LastFault());
+    command_.Say(file_ + ": the store failed: " + workspace_.Host().LastFault() +
+                 (untried > 0 ? "; " + Counted(untried, "row", "rows") + " not tried" : ""));
   }
 
   void SayUnstored() {
     const std::size_t unstored = workspace_.Host().UnstoredLogRecords();
     if (unstored == 0) return;
-    command_.Say(Counted(unstored, "log record", "log records") +
-                 " could not be stored: " + workspace_.Host().LastFault());
+    const std::string& fault = workspace_.Host().LastFault();
+    command_.Say(Counted(unstored, "log record", "log records") + " could not be stored" +
+                 (fault.empty() ? "" : ": " + fault));
     status_ = kTurnedAway;
   }
 

@@ -28,6 +28,7 @@ bool LogStore::Add(const RecordType& type, void* record) {
   log.LogId = *id;
   waiting_.push_back(log);
   Session().Succeeded();
+  Session().OpenEarly();
   return true;
 }
 
@@ -61,7 +62,8 @@ std::optional<std::int32_t> LogStore::NextId() {
 
 // Within a transaction the reservation is only as durable as that.
 bool LogStore::FindIds() {
-  if (!Session().InTransaction()) return Session().CommitRider() && IdsLeft() > 0;
+  if (!Session().InExplicit() && !Session().HasChanges()) return Session().CommitRider() && IdsLeft() > 0;
+  if (!Session().InTransaction()) return false;
   try {
     ReserveIds();
   } catch (const soci::soci_error& error) {

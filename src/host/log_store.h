@@ -14,8 +14,7 @@
 namespace partnerkit::host {
 
 // A log record waits in memory for the next commit, whosever that is, and is written again with the one behind it when
-// the database takes that back. Until then it is found by its id only. Records by themselves open no transaction, and
-// so keep no other program waiting.
+// the database takes that back. Until then it is found by its id only.
 //
 // An id that somebody has seen is never given again, so ids are handed out from blocks that are reserved durably
 // beforehand. What a program has not used of its blocks it gives back at the end, unless another has reserved ids

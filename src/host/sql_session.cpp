@@ -153,9 +153,23 @@ bool SqlSession::EnsureWriting() {
   }
   if (state_ != State::kNone) return false;
   ForgetToldLoss();
-  Run(begin_, dialect_->beginWrite);
-  state_ = State::kImplicit;
+  Open(State::kImplicit);
   return true;
+}
+
+void SqlSession::Open(State state) {
+  if (!openedEarly_) Run(begin_, dialect_->beginWrite);
+  openedEarly_ = state == State::kNone;
+  state_ = state;
+}
+
+void SqlSession::OpenEarly() noexcept {
+  if (state_ != State::kNone) return;
+  try {
+    Open(State::kNone);
+  } catch (const soci::soci_error& error) {
+    Failed(error);
+  }
 }
 
 void SqlSession::Abandon() noexcept {
@@ -172,7 +186,7 @@ void SqlSession::Commit() {
 bool SqlSession::CommitRider() {
   if (state_ != State::kNone || rider_ == nullptr) return false;
   try {
-    Run(begin_, dialect_->beginWrite);
+    Open(State::kNone);
     WriteAndCommit();
   } catch (const soci::soci_error& error) {
     Failed(error);
@@ -196,8 +210,7 @@ void SqlSession::Begin() {
   ForgetToldLoss();
   if (!loss_.empty()) TellLoss();
   if (state_ == State::kImplicit) CommitOpen();
-  Guarded([this] { Run(begin_, dialect_->beginWrite); });
-  state_ = State::kExplicit;
+  Guarded([this] { Open(State::kExplicit); });
 }
 
 void SqlSession::CommitExplicit() {
@@ -235,6 +248,7 @@ void SqlSession::WriteAndCommit() {
   if (rider_ != nullptr) rider_->BeforeCommit();
   Run(commit_, "COMMIT");
   state_ = State::kNone;
+  openedEarly_ = false;
   if (rider_ != nullptr) rider_->Committed();
   Succeeded();
   GiveTurn();
@@ -242,6 +256,7 @@ void SqlSession::WriteAndCommit() {
 
 void SqlSession::RollBackOpen() noexcept {
   state_ = State::kNone;
+  openedEarly_ = false;
   if (rider_ != nullptr) rider_->TakenBack();
   if (!InTransaction()) return;
   try {
@@ -276,7 +291,9 @@ void SqlSession::Failed(const soci::soci_error& error) {
     ++faults_;
     lastFault_ = MessageOf(error);
   }
-  if (state_ == State::kNone || InTransaction()) return;
+  if (InTransaction()) return;
+  openedEarly_ = false;
+  if (state_ == State::kNone) return;
   NoteLoss(MessageOf(error));
   if (state_ == State::kImplicit) state_ = State::kNone;
   if (rider_ != nullptr) rider_->TakenBack();
