@@ -22,7 +22,6 @@ void WriteLogRecords(JsonWriter& json, const std::vector<std::int32_t>& logIds, 
   for (const std::int32_t logId : logIds) {
     Log log;
     log.LogId = logId;
-    // A record taken back with its transaction is no record.
     if (!store.Load(Log::kType, &log)) continue;
     json.BeginObject();
     for (const std::string_view name : kLogMembers) {

@@ -9,6 +9,7 @@
 
 #include "cli/progress.h"
 #include "cli/run_report.h"
+#include "cli/table.h"
 #include "cli/text.h"
 #include "cli/watched_host.h"
 #include "cli/workspace.h"
@@ -95,9 +96,11 @@ class Run {
       for (std::size_t row = 0; row < report_.rows.Rows(); ++row) rows.push_back(static_cast<std::int64_t>(row));
     }
     for (const std::int64_t row : rows) {
+      if (StoreFailed()) break;
       ProcessRow(static_cast<std::int32_t>(row));
       progress_.Show("processing", report_.results.size(), rows.size());
     }
+    if (StoreFailed()) GiveUp(rows.size() - report_.results.size());
   }
 
   // The lines of finished rows leave the file only once the store holds for good what became of them.
@@ -128,6 +131,7 @@ class Run {
     report_.logIds = host_.LogIds();
     PrintRun(command_, report_, host_.Records());
     workspace_.Host().Close();
+    SayUnstored();
     return workspace_.HadFault() ? kTurnedAway : status_;
   }
 
@@ -137,10 +141,34 @@ class Run {
     const std::int32_t deletedBefore = host_.OrdersDeleted();
     const std::int32_t id = translator_->Process(row, result.errorLog);
     result.result = id;
-    const bool orderGone = host_.OrdersDeleted() > deletedBefore;
+    // What a row leaves uncommitted must not be lost behind a later row that was settled by it.
+    if (!StoreFailed() && workspace_.Host().HasChanges()) CommitHost();
+    // A failing store may have taken the deletion back.
+    const bool orderGone = host_.OrdersDeleted() > deletedBefore && !StoreFailed();
     result.outcome = OutcomeOf(id, orderGone, SaysOnlyWarnings(result.errorLog));
     if (result.outcome == Outcome::kTurnedAway) status_ = kTurnedAway;
     report_.results.push_back(std::move(result));
+  }
+
+  bool StoreFailed() { return workspace_.Host().Faults() > 0; }
+
+  // Behind a failing store nothing more is tried. What is done was durable before it counted as done, so it may be
+  // settled whatever the store has lost.
+  void GiveUp(std::size_t untried) {
+    progress_.Clear();
+    workspace_.Host().Recover();
+    status_ = kTurnedAway;
+    command_.Say(file_ + ": the store failed: " + workspace_.Host().LastFault() +
+                 (untried > 0 ? "; " + Counted(untried, "row", "rows") + " not tried" : ""));
+  }
+
+  void SayUnstored() {
+    const std::size_t unstored = workspace_.Host().UnstoredLogRecords();
+    if (unstored == 0) return;
+    const std::string& fault = workspace_.Host().LastFault();
+    command_.Say(Counted(unstored, "log record", "log records") + " could not be stored" +
+                 (fault.empty() ? "" : ": " + fault));
+    status_ = kTurnedAway;
   }
 
   // A posting leaves information. Warnings alone tell of a stored order that was cancelled or changed in place, and its

@@ -23,16 +23,9 @@ class WatchedHost : public System, private RecordStore {
   std::string UserId() override { return host_.UserId(); }
   bool DeleteOrder(const Order& order) override;
   void Commit(std::int32_t mode) override { host_.Commit(mode); }
-  void BeginTrans() override {
-    host_.BeginTrans();
-    logIdsBefore_ = logIds_.size();
-  }
+  void BeginTrans() override { host_.BeginTrans(); }
   void CommitTrans() override { host_.CommitTrans(); }
-  void RollbackTrans() override {
-    host_.RollbackTrans();
-    if (logIds_.size() > logIdsBefore_) logIds_.resize(logIdsBefore_);
-    logs_.resize(logIds_.size());
-  }
+  void RollbackTrans() override { host_.RollbackTrans(); }
   std::vector<EDIDoc> EDIDocList() override { return host_.EDIDocList(); }
   std::int32_t NextNumber(std::string_view partnerId, Counter counter) override {
     return host_.NextNumber(partnerId, counter);
@@ -68,8 +61,7 @@ class WatchedHost : public System, private RecordStore {
   host::SqlHost& host_;
   RecordStore& records_;
   std::vector<std::int32_t> logIds_;
-  std::vector<Log> logs_;         // of the same
-  std::size_t logIdsBefore_ = 0;  // the transaction
+  std::vector<Log> logs_;  // of the same
   std::int32_t ordersDeleted_ = 0;
 };
 

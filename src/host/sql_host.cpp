@@ -8,6 +8,7 @@
 #include <limits>
 #include <map>
 
+#include "host/log_store.h"
 #include "host/schema.h"
 #include "host/statement.h"
 #include "partnerkit/run_time_error.h"
@@ -86,7 +87,7 @@ struct SqlHost::Parts {
   }
 
   SqlSession session;
-  SqlStore store;
+  LogStore store;
   std::map<std::string, std::unique_ptr<Statement>> statements;
   std::map<std::string, std::optional<std::string>, std::less<>> settings;
   std::optional<std::string> loginName;
@@ -94,7 +95,13 @@ struct SqlHost::Parts {
 
 SqlHost::SqlHost(std::unique_ptr<Parts> parts) : parts_(std::move(parts)) {}
 
-SqlHost::~SqlHost() = default;
+SqlHost::~SqlHost() {
+  try {
+    Close();
+  } catch (const RunTimeError&) {
+    // Nobody is left to be told; what could not be committed is as if the program had been killed.
+  }
+}
 
 std::unique_ptr<SqlHost> SqlHost::Open(std::string_view url, const SqlOptions& options) {
   auto parts = std::make_unique<Parts>(url, options);
@@ -113,15 +120,40 @@ std::string SqlHost::UserId() {
 }
 
 void SqlHost::Commit(std::int32_t) { parts_->session.Commit(); }
-void SqlHost::BeginTrans() { parts_->session.Begin(); }
 void SqlHost::CommitTrans() { parts_->session.CommitExplicit(); }
+
+// What the log may need meanwhile is better reserved for good.
+void SqlHost::BeginTrans() {
+  if (parts_->store.IsLowOnIds()) parts_->session.CommitRider();
+  parts_->session.Begin();
+}
 
 void SqlHost::RollbackTrans() {
   parts_->session.RollbackExplicit();
+  if (parts_->store.HasExposedIds()) parts_->session.CommitRider();
   parts_->settings.clear();
 }
 
-void SqlHost::Close() { parts_->session.Close(); }
+void SqlHost::Close() {
+  parts_->store.SetClosing(true);
+  try {
+    parts_->session.Close();
+  } catch (...) {
+    parts_->store.SetClosing(false);
+    throw;
+  }
+  parts_->store.SetClosing(false);
+}
+
+std::size_t SqlHost::UnstoredLogRecords() const { return parts_->store.Unstored(); }
+
+bool SqlHost::HasChanges() const { return parts_->session.HasChanges(); }
+
+std::int64_t SqlHost::Faults() const { return parts_->session.Faults(); }
+
+const std::string& SqlHost::LastFault() const { return parts_->session.LastFault(); }
+
+void SqlHost::Recover() { parts_->session.Recover(); }
 
 bool SqlHost::DeleteOrder(const Order& order) {
   SqlSession& session = parts_->session;
@@ -155,11 +187,16 @@ bool SqlHost::DeleteOrder(const Order& order) {
   return done;
 }
 
+// Only a change shows that the file is read-only.
 void SqlHost::CheckWritable() {
-  BeginTrans();
-  // Only a change shows that the file is read-only; this one changes nothing.
-  parts_->session.Execute("DELETE FROM \"tbLog\" WHERE 0 = 1");
-  RollbackTrans();
+  parts_->session.Begin();
+  try {
+    parts_->session.Guarded([&] { parts_->store.ReserveIds(); });
+  } catch (...) {
+    parts_->session.RollbackExplicit();
+    throw;
+  }
+  parts_->session.CommitExplicit();
 }
 
 std::vector<EDIDoc> SqlHost::EDIDocList() {
@@ -206,6 +243,8 @@ std::vector<std::shared_ptr<Pack>> SqlHost::PacksToCompile(std::string_view vend
       for (std::size_t n = 0; n < kinds.size(); ++n) waiting.Column(n).CopyTo(Pack::kType.members[n].at(&pack));
     }
     waiting.Reset();
+    // Each of them is told of in the transaction of its notice.
+    parts_->store.Foresee(packs.size());
     return packs;
   });
 }

@@ -23,7 +23,8 @@ bool DropThreadGuards();
 
 // Changes are grouped as SqlSession tells: `Commit` makes them durable, and so do `Close` and the destructor, since
 // what a failed posting leaves behind is kept for the next run to find. Only a killed program loses what it did not
-// commit. While changes wait for their commit, other programs on the same database wait too.
+// commit. While changes wait for their commit, other programs on the same database wait too. Log records are nobody's
+// change; see LogStore.
 class SqlHost : public DatabaseHost {
  public:
   // Opens the database and makes or updates its tables. `url` is a file path, with or without "sqlite3://" before it.
@@ -50,9 +51,20 @@ class SqlHost : public DatabaseHost {
   bool StampPack(std::int32_t packId, std::int32_t noticeId) override;
 
   // Raises RunTimeError when the database cannot be written to, or is locked by another program beyond the time-out.
+  // Reserves ids for the run log, which has to be done before its first record anyway.
   void CheckWritable() override;
-  // Commits what waits for it. Raises RunTimeError.
+  // Commits what waits for it, and gives the log's unused ids back. Raises RunTimeError.
   void Close() override;
+  // Log records that the database has not got. What `Commit` makes durable doesn't wait for them.
+  std::size_t UnstoredLogRecords() const;
+  // Changes wait for their commit.
+  bool HasChanges() const;
+  // How often the database itself failed (the disk, memory, a lock beyond the time-out), not a record for its own
+  // sake; and what it said the last time.
+  std::int64_t Faults() const;
+  const std::string& LastFault() const;
+  // Behind a fault: see SqlSession.
+  void Recover();
 
   // The host's settings, the members of `System` by name. They raise RunTimeError. One that was asked for is kept, so
   // that a change by another program counts from the next opening on.

@@ -153,9 +153,23 @@ bool SqlSession::EnsureWriting() {
   }
   if (state_ != State::kNone) return false;
   ForgetToldLoss();
-  Run(begin_, dialect_->beginWrite);
-  state_ = State::kImplicit;
+  Open(State::kImplicit);
   return true;
+}
+
+void SqlSession::Open(State state) {
+  if (!openedEarly_) Run(begin_, dialect_->beginWrite);
+  openedEarly_ = state == State::kNone;
+  state_ = state;
+}
+
+void SqlSession::OpenEarly() noexcept {
+  if (state_ != State::kNone) return;
+  try {
+    Open(State::kNone);
+  } catch (const soci::soci_error& error) {
+    Failed(error);
+  }
 }
 
 void SqlSession::Abandon() noexcept {
@@ -166,14 +180,37 @@ void SqlSession::Commit() {
   if (state_ == State::kExplicit) Raise("commit within a transaction");
   if (!loss_.empty()) TellLoss();
   if (state_ == State::kImplicit) CommitOpen();
+  else if (rider_ != nullptr && rider_->Waits()) CommitRider();
+}
+
+bool SqlSession::CommitRider() {
+  if (state_ != State::kNone || rider_ == nullptr) return false;
+  try {
+    Open(State::kNone);
+    WriteAndCommit();
+  } catch (const soci::soci_error& error) {
+    Failed(error);
+    RollBackOpen();
+    return false;
+  }
+  return true;
+}
+
+void SqlSession::Recover() {
+  RollbackExplicit();
+  try {
+    Commit();
+  } catch (const RunTimeError&) {
+    ForgetToldLoss();
+  }
 }
 
 void SqlSession::Begin() {
   if (state_ == State::kExplicit) Raise("a transaction is open already");
   ForgetToldLoss();
-  Commit();
-  Guarded([this] { Run(begin_, dialect_->beginWrite); });
-  state_ = State::kExplicit;
+  if (!loss_.empty()) TellLoss();
+  if (state_ == State::kImplicit) CommitOpen();
+  Guarded([this] { Open(State::kExplicit); });
 }
 
 void SqlSession::CommitExplicit() {
@@ -193,24 +230,34 @@ bool SqlSession::InTransaction() { return sqlite_api::sqlite3_get_autocommit(Con
 
 void SqlSession::Close() {
   RollbackExplicit();
-  if (!lossTold_) Commit();
+  ForgetToldLoss();
+  Commit();
 }
 
 void SqlSession::CommitOpen() {
   try {
-    Run(commit_, "COMMIT");
+    WriteAndCommit();
   } catch (const soci::soci_error& error) {
     Failed(error);
     NoteLoss(MessageOf(error));
     TellLoss();
   }
+}
+
+void SqlSession::WriteAndCommit() {
+  if (rider_ != nullptr) rider_->BeforeCommit();
+  Run(commit_, "COMMIT");
   state_ = State::kNone;
+  openedEarly_ = false;
+  if (rider_ != nullptr) rider_->Committed();
   Succeeded();
   GiveTurn();
 }
 
 void SqlSession::RollBackOpen() noexcept {
   state_ = State::kNone;
+  openedEarly_ = false;
+  if (rider_ != nullptr) rider_->TakenBack();
   if (!InTransaction()) return;
   try {
     Run(rollback_, "ROLLBACK");
@@ -240,9 +287,16 @@ void SqlSession::TellLoss() {
 void SqlSession::Failed(const soci::soci_error& error) {
   const int code = sqlite_api::sqlite3_extended_errcode(Connection());
   nativeError_ = code == SQLITE_OK ? SQLITE_ERROR : code;
-  if (state_ == State::kNone || InTransaction()) return;
+  if (NewestIsFault()) {
+    ++faults_;
+    lastFault_ = MessageOf(error);
+  }
+  if (InTransaction()) return;
+  openedEarly_ = false;
+  if (state_ == State::kNone) return;
   NoteLoss(MessageOf(error));
   if (state_ == State::kImplicit) state_ = State::kNone;
+  if (rider_ != nullptr) rider_->TakenBack();
 }
 
 std::string SqlSession::MessageOf(const soci::soci_error& error) const {
@@ -270,5 +324,17 @@ void SqlSession::GiveTurn() {
 }
 
 bool SqlSession::ForbiddenByConstraint() const { return (nativeError_ & 0xff) == SQLITE_CONSTRAINT; }
+
+bool SqlSession::NewestIsFault() const {
+  switch (nativeError_ & 0xff) {
+    case SQLITE_OK:
+    case SQLITE_CONSTRAINT:
+    case SQLITE_TOOBIG:
+    case SQLITE_MISMATCH:
+      return false;
+    default:
+      return true;
+  }
+}
 
 }  // namespace partnerkit::host

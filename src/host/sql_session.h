@@ -28,6 +28,22 @@ struct Dialect {
 // A name inside a statement: "OrderId".
 std::string Quoted(std::string_view identifier);
 
+// What goes along with every commit without being part of anyone's transaction: it is written into each one that is
+// about to be committed, and again into the next when that one is taken back.
+class Rider {
+ public:
+  // There is something to write even where nobody else has changed anything.
+  virtual bool Waits() const = 0;
+  // Writes into the transaction that is about to be committed. Raises soci::soci_error.
+  virtual void BeforeCommit() = 0;
+  virtual void Committed() noexcept = 0;
+  // The open transaction is gone, whether or not anything was written into it.
+  virtual void TakenBack() noexcept = 0;
+
+ protected:
+  ~Rider() = default;
+};
+
 // Changes gather in an implicit transaction, which the first one opens and `Commit` makes durable; `Begin` opens an
 // explicit one. Reading opens neither.
 //
@@ -56,8 +72,20 @@ class SqlSession {
   bool EnsureWriting();
   // Gives up the implicit transaction that the change in hand has opened in vain.
   void Abandon() noexcept;
+  // Null for none.
+  void Carry(Rider* rider) { rider_ = rider; }
+  // Opens the transaction that the next change would open: all that is read until then is read within it, which spares
+  // each statement the locking. A failure is noted, and no more.
+  void OpenEarly() noexcept;
+  // Commits the rider's part alone, where nothing has been changed. False, with the failure noted, when the database
+  // refuses; the rider then still has it, and nothing else is lost.
+  bool CommitRider();
+  // Ends what a failing database has left of the transactions: an explicit one is taken back, an implicit one that is
+  // still whole is committed. One that was lost is from now on nobody's concern, so that the next commit succeeds: for
+  // a caller that knows what of it had counted as done. That is nothing where a commit came first.
+  void Recover();
 
-  // These raise RunTimeError.
+  // These raise RunTimeError. `Commit` tells of a failure of its own part only: the rider's can wait.
   void Commit();
   void Begin();
   void CommitExplicit();
@@ -69,11 +97,19 @@ class SqlSession {
   bool InTransaction();
   // One that Begin opened.
   bool InExplicit() const { return state_ == State::kExplicit; }
+  // An implicit transaction waits for its commit.
+  bool HasChanges() const { return state_ == State::kImplicit; }
 
   // The newest failure's number, 0 after a success.
   std::int32_t NativeError() const { return nativeError_; }
   // The newest failure was a rule of the database, not a failing one.
   bool ForbiddenByConstraint() const;
+  // The newest failure was the database's (the disk, memory, a lock beyond the time-out), not its opinion of one
+  // record.
+  bool NewestIsFault() const;
+  // How many such failures there were, and what the newest one was.
+  std::int64_t Faults() const { return faults_; }
+  const std::string& LastFault() const { return lastFault_; }
   void Succeeded() { nativeError_ = 0; }
   // Takes note of a failed statement: its number, and whether the transaction went with it.
   void Failed(const soci::soci_error& error);
@@ -98,11 +134,13 @@ class SqlSession {
  private:
   enum class State { kNone, kImplicit, kExplicit };
 
+  void Open(State state);
   void Configure();
   void UseWriteAheadLog();
   static int WaitForLock(void* self, int attempt);
   void Run(std::unique_ptr<soci::statement>& statement, std::string_view sql);
   void CommitOpen();
+  void WriteAndCommit();
   void RollBackOpen() noexcept;
   void NoteLoss(const std::string& cause);
   void ForgetToldLoss();
@@ -117,10 +155,14 @@ class SqlSession {
   soci::session soci_;
   std::unique_ptr<soci::statement> begin_, commit_, rollback_;
   State state_ = State::kNone;
-  std::string loss_;  // why the transaction was lost; empty when none was
+  bool openedEarly_ = false;  // with kNone
+  std::string loss_;          // why the transaction was lost; empty when none was
   std::int32_t lossNumber_ = 0;
   bool lossTold_ = false;
   std::int32_t nativeError_ = 0;
+  std::int64_t faults_ = 0;
+  std::string lastFault_;
+  Rider* rider_ = nullptr;
   std::int64_t prepared_ = 0;
   std::chrono::steady_clock::time_point lockDeadline_, lastTurn_;
 };

@@ -41,6 +41,11 @@ class SqlStore : public RecordStore {
   // Removes every record that fits `probe`. False when the store refuses; how many there were doesn't matter.
   bool DeleteAll(const RecordType& type, const Lookup& lookup, const void* probe);
 
+ protected:
+  SqlSession& Session() { return session_; }
+  // Writes a new record into the transaction that is open. Raises soci::soci_error.
+  bool Insert(const RecordType& type, void* record);
+
  private:
   enum class Operation : std::uint8_t {
     kAdd,
@@ -70,7 +75,6 @@ class SqlStore : public RecordStore {
   std::unique_ptr<Prepared> Prepare(const RecordType& type, Operation operation, const Lookup* lookup);
   template <class F>
   bool Change(F&& change);
-  bool Insert(const RecordType& type, void* record);
   bool Write(const RecordType& type, Operation operation, const void* record);
   bool ReadOne(Lease& lease, void* record);
 

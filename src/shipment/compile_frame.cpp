@@ -167,20 +167,17 @@ std::int32_t CompileFrame::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog
 // In memory, of one state of the store. The number, and what the files are to be cut back to should the program be
 // killed, are durable before the first byte is written, in one wait for the disk.
 bool CompileFrame::Make(Notice& notice) {
-  const std::size_t told = notice.log.Ids().size();
   if (!Try([&] { Host().BeginTrans(); })) return false;
   try {
     const bool made = Number(notice) && OpenOutput(notice) && WriteNotice(notice) && NotePending(notice);
     if (!made) ForgetAll(notice);
     if (Try([&] { Host().CommitTrans(); })) return made;
   } catch (...) {
-    // What was told until then stays.
     const HandlerOff off(Errors());
     ForgetAll(notice);
-    if (!Try([&] { Host().CommitTrans(); })) notice.log.Ids().resize(told);
+    Try([&] { Host().CommitTrans(); });
     throw;
   }
-  notice.log.Ids().resize(told);
   return false;
 }
 
@@ -289,13 +286,10 @@ void CompileFrame::ForgetAll(Notice& notice) {
 
 bool CompileFrame::Stamp(Notice& notice) {
   Try([&] { Host().BeginTrans(); });
-  const std::size_t told = notice.log.Ids().size();
   try {
     StampInTransaction(notice);
   } catch (const RunTimeError& error) {
     Try([&] { Host().RollbackTrans(); });
-    // A record written meanwhile went with the transaction.
-    notice.log.Ids().resize(told);
     notice.asn.Id = 0;
     GiveUp(notice);
     notice.log.Note(error.Number(), "Process",
@@ -308,6 +302,7 @@ bool CompileFrame::Stamp(Notice& notice) {
     pack->Status = kCompiled;
   }
   notice.files.Settle();
+  if (!compile_.tellsLast) TellCompiled(notice);
   return true;
 }
 
@@ -325,7 +320,6 @@ void CompileFrame::StampInTransaction(Notice& notice) {
     if (!Update(Records(), shipment)) RaiseStore(*this, "The shipment cannot be stamped");
   }
   for (const PendingNotice& pending : notice.pending) Forget(pending);
-  if (!compile_.tellsLast) TellCompiled(notice);
   Host().CommitTrans();
 }
 

@@ -6,6 +6,7 @@
 #include <cerrno>
 
 #include "cli/supplier.h"
+#include "host/sql_session.h"
 
 namespace partnerkit::testing {
 namespace {
@@ -28,6 +29,7 @@ class RunDocument : public Supplier {
     return chosen;
   }
   std::string Orders() { return folder.Read("inbox/orders.csv"); }
+  void Sql(const std::string& sql) { host::SqlHost::Open(folder / "partnerkit.db")->Session().Execute(sql); }
 };
 
 TEST_F(RunDocument, ShowsTheGridAndChangesNothing) {
@@ -164,6 +166,33 @@ TEST_F(RunDocument, TellsAFaultOnOneLineAndKeepsTheFile) {
   std::filesystem::remove_all(folder / "backup/po.csv.pending");
   EXPECT_EQ(Run({"process", "1", "inbox/orders.csv", "--row", "0"}).status, 1);
   EXPECT_EQ(Orders().find("4500012345"), std::string::npos);
+}
+
+// The second order meets an error of the database that is no rule of it.
+TEST_F(RunDocument, StopsBehindAFailingStoreAndSettlesWhatIsDone) {
+  Sql("CREATE TRIGGER fault BEFORE INSERT ON tbOrderLine WHEN new.OrderId=2 "
+      "BEGIN SELECT abs(-9223372036854775807-1); END");
+  const Ran ran = Run({"--json", "process", "1", "inbox/orders.csv"});
+  EXPECT_EQ(ran.status, 1);
+  EXPECT_EQ(ran.err, "partnerkit: inbox/orders.csv: the store failed: integer overflow; 2 rows not tried\n");
+  EXPECT_EQ(json::parse(ran.out)["results"], json::parse(R"([{"row": 0, "result": 1, "errorLog": [1]},
+                                                            {"row": 1, "result": 0, "errorLog": [2]}])"));
+  EXPECT_EQ(Orders(), Sample("orders.csv").substr(Sample("orders.csv").find("000000481,481,0002")));
+  EXPECT_EQ(Json({"log"})["log"].size(), 2U);
+  Sql("DROP TRIGGER fault");
+  EXPECT_EQ(Json({"process", "1", "inbox/orders.csv"}, 1)["results"][0]["errorLog"], json::parse("[3, 4]"));
+  EXPECT_EQ(Orders(), OrderAs("4500012351", "00", "000000481"));
+}
+
+// A record that doesn't get to the log is in the report, and the rows before it are as done as ever.
+TEST_F(RunDocument, TellsWhichRecordsTheLogHasNotGot) {
+  Sql("CREATE TRIGGER rule BEFORE INSERT ON tbLog WHEN new.Message LIKE '%4500012346%' BEGIN SELECT RAISE(ABORT,'no'); "
+      "END");
+  const Ran ran = Run({"--json", "process", "1", "inbox/orders.csv", "--row", "0", "--row", "1"});
+  EXPECT_EQ(ran.status, 1);
+  EXPECT_EQ(ran.err, "partnerkit: 1 log record could not be stored\n");
+  EXPECT_EQ(json::parse(ran.out)["log"][1]["Message"], "PO 4500012346 import completed.");
+  EXPECT_EQ(Json({"log"})["log"].size(), 1U);
 }
 
 TEST_F(RunDocument, ShowsTextThatIsNotUtf8AsWindows1252) {

@@ -17,6 +17,7 @@ import verdict
 from workspace import BACKUP, ORDER_FILE, Scenario
 
 NOBODY = 65534
+COMMITS_OF_START = 1  # the log's ids
 
 
 class Case:
@@ -51,7 +52,7 @@ class Case:
     def stopped(self):
         """A run that has posted a few orders."""
         return self.program.process_stopped(
-            self.folder, f"stop-after commit {self.scenario.file.commits_of_listing() + 3}")
+            self.folder, f"stop-after commit {COMMITS_OF_START + self.scenario.file.commits_of_listing() + 3}")
 
 
 # --- Locks

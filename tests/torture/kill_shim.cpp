@@ -123,6 +123,16 @@ int rename(const char* from, const char* to) noexcept {
       [&] { return Real<int(const char*, const char*)>("rename")(from, to); }, [] {});
 }
 
+int renameat2(int fromFolder, const char* from, int toFolder, const char* to, unsigned flags) noexcept {
+  return Operation(
+      "rename", [&] { return std::string(to); },
+      [&] {
+        return Real<int(int, const char*, int, const char*, unsigned)>("renameat2")(fromFolder, from, toFolder, to,
+                                                                                    flags);
+      },
+      [] {});
+}
+
 int unlink(const char* path) noexcept {
   return Operation(
       "unlink", [&] { return std::string(path); }, [&] { return Real<int(const char*)>("unlink")(path); }, [] {});

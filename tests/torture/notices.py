@@ -11,6 +11,7 @@ import sqlite3
 import tempfile
 import threading
 
+import told
 import verdict
 from workspace import must
 
@@ -131,6 +132,7 @@ class NoticeTrade:
         if last.status in (0, 1):
             found += store_violations(scenario, folder, [scenario.output])
             found += verdict.log_violations(folder, program)
+            found += told.violations(folder, [*earlier, last], stored="SELECT Id, OrderNo FROM tbASN", column=3)
         return found
 
 

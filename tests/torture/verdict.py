@@ -4,10 +4,10 @@ import json
 import signal
 import sqlite3
 
+import told
 from kinds import KEPT
+from told import DATABASE
 from workspace import BACKUP, EARLIER_BACKUP, ORDER_FILE
-
-DATABASE = "partnerkit.db"
 
 
 def violations(scenario, folder, program, last, *, earlier=()):
@@ -22,6 +22,7 @@ def violations(scenario, folder, program, last, *, earlier=()):
     found += written_violations(scenario, folder, [*earlier, last])
     found += leftovers(scenario, folder)
     found += log_violations(folder, program)
+    found += told.violations(folder, [*earlier, last])
     return found
 
 

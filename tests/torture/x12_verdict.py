@@ -1,7 +1,9 @@
 """What has to hold of X12 orders once a plain run has followed the runs that were struck."""
 
 import re
+import signal
 
+import told
 import verdict
 from kinds import CARRIED_OUT, KEPT
 from workspace import ORDER_FILE
@@ -31,6 +33,7 @@ def violations(scenario, folder, program, last, *, earlier=()):
         found += written_violations(scenario, folder, runs)
         found += leftovers(scenario, folder, earlier)
         found += verdict.log_violations(folder, program)
+        found += told.violations(folder, runs)
     return found
 
 
@@ -61,8 +64,11 @@ def left_violations(file, path, last, runs):
 
 def written_violations(scenario, folder, runs):
     """Of the files beside the order file; the last of the runs was a plain one."""
+    last = runs[-1]
+    # Where the archive's own operations fail, the run goes on without.
+    needed = last.order_file or any(run.status == -signal.SIGKILL for run in runs)
     return (acknowledgement_violations(scenario, folder, max(len(runs), 2))
-            + archive_violations(scenario, folder, runs[-1:] if runs[-1].order_file else runs, needed=True))
+            + archive_violations(scenario, folder, [last] if last.order_file else runs, needed))
 
 
 def together_violations(scenario, folder):
