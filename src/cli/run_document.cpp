@@ -138,7 +138,7 @@ class Run {
  private:
   void ProcessRow(std::int32_t row) {
     RowResult result = {row, std::int32_t{0}, {}};
-    const std::int32_t deletedBefore = host_.OrdersDeleted();
+    const std::int32_t deletedBefore = host_.OrdersDeleted(), unsettledBefore = host_.OrdersFoundUnsettled();
     const std::int32_t id = translator_->Process(row, result.errorLog);
     result.result = id;
     // What a row leaves uncommitted must not be lost behind a later row that was settled by it.
@@ -146,7 +146,8 @@ class Run {
     // A failing store may have taken the deletion back.
     const bool orderGone = host_.OrdersDeleted() > deletedBefore && !StoreFailed();
     result.outcome = OutcomeOf(id, orderGone, SaysOnlyWarnings(result.errorLog));
-    if (result.outcome == Outcome::kTurnedAway) status_ = kTurnedAway;
+    if (id == 0 && host_.OrdersFoundUnsettled() > unsettledBefore) result.outcome = Outcome::kStoredEarlier;
+    if (result.outcome == Outcome::kTurnedAway || result.outcome == Outcome::kStoredEarlier) status_ = kTurnedAway;
     report_.results.push_back(std::move(result));
   }
 

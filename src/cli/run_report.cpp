@@ -77,6 +77,8 @@ std::string Told(const RunReport& report, const RowResult& result) {
       return "cancelled";
     case Outcome::kDeleted:
       return "deleted";
+    case Outcome::kStoredEarlier:
+      return "stored earlier";
     default:
       return "NOT DONE";
   }
@@ -109,6 +111,7 @@ void PrintSummary(const Command& command, const RunReport& report) {
                                                            {Outcome::kChanged, "changed"},
                                                            {Outcome::kCancelled, "cancelled"},
                                                            {Outcome::kDeleted, "deleted"},
+                                                           {Outcome::kStoredEarlier, "stored earlier"},
                                                            {Outcome::kTurnedAway, "not done"}};
   for (const auto& [outcome, word] : outcomes) {
     const auto count = std::ranges::count(report.results, outcome, &RowResult::outcome);

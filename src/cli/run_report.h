@@ -12,7 +12,7 @@
 
 namespace partnerkit::cli {
 
-enum class Outcome { kPosted, kChanged, kCancelled, kDeleted, kTurnedAway };
+enum class Outcome { kPosted, kChanged, kCancelled, kDeleted, kStoredEarlier, kTurnedAway };
 
 struct RowResult {
   std::int64_t row;

@@ -19,7 +19,9 @@ bool WatchedHost::Load(const RecordType& type, void* record) {
       return true;
     }
   }
-  return records_.Load(type, record);
+  const bool found = records_.Load(type, record);
+  if (found && &type == &UnsettledOrder::kType) ++ordersFoundUnsettled_;
+  return found;
 }
 
 bool WatchedHost::Add(const RecordType& type, void* record) {

@@ -18,6 +18,8 @@ class WatchedHost : public System, private RecordStore {
   const std::vector<std::int32_t>& LogIds() const { return logIds_; }
   // How many orders the store gave up.
   std::int32_t OrdersDeleted() const { return ordersDeleted_; }
+  // How many were found that a run stored which was stopped before it settled its file.
+  std::int32_t OrdersFoundUnsettled() const { return ordersFoundUnsettled_; }
 
   RecordStore& Records() override { return *this; }
   std::string UserId() override { return host_.UserId(); }
@@ -63,6 +65,7 @@ class WatchedHost : public System, private RecordStore {
   std::vector<std::int32_t> logIds_;
   std::vector<Log> logs_;  // of the same
   std::int32_t ordersDeleted_ = 0;
+  std::int32_t ordersFoundUnsettled_ = 0;
 };
 
 }  // namespace partnerkit::cli

@@ -164,8 +164,12 @@ TEST_F(RunDocument, TellsAFaultOnOneLineAndKeepsTheFile) {
   EXPECT_EQ(json::parse(ran.out)["results"][0]["result"], 1);
   EXPECT_EQ(Orders(), Sample("orders.csv"));
   std::filesystem::remove_all(folder / "backup/po.csv.pending");
-  EXPECT_EQ(Run({"process", "1", "inbox/orders.csv", "--row", "0"}).status, 1);
+  const Ran again = Run({"process", "1", "inbox/orders.csv", "--row", "0"});
+  EXPECT_EQ(again.status, 1);
+  EXPECT_THAT(again.out, HasSubstr("000000481/481/0001  stored earlier\n"));
+  EXPECT_THAT(again.out, HasSubstr("4 rows, 1 stored earlier.\n"));
   EXPECT_EQ(Orders().find("4500012345"), std::string::npos);
+  EXPECT_THAT(folder.Read("backup/po.csv"), HasSubstr("4500012345"));
 }
 
 // The second order meets an error of the database that is no rule of it.

@@ -48,7 +48,7 @@ def order_type(code, **others):
 
 
 REPLACES = Kind("replaces", POSTED, purpose("07"), ORDER)
-REPLACES_IN_VAIN = Kind("replaces in vain", KEPT, purpose("07", SHIPTOLOCPARTNERNO="9999"), ORDER)
+REPLACES_IN_VAIN = Kind("replaces in vain", KEPT, purpose("07", SHIPTOLOCPARTNERNO="9999"), ORDER, True)
 REPLACES_PACKED = Kind("replaces a packed one", DROPPED, purpose("07"), PACKED, True)
 CHANGES = Kind("changes", POSTED, purpose("05"), ORDER)
 CANCELS = Kind("cancels", DROPPED, purpose("01"), ORDER)
@@ -112,7 +112,7 @@ KINDS = {
     "clsTargetBulkPOcsv": (*BY_GTIN, Kind("other inner", KEPT, {"UNITSINNERPACK": "36"})),
     "clsColesEIDCPOcsv": (*COMMON, UNKNOWN_PRODUCT, OTHER_COST, HALF_STORED,
                           Kind("replaces", POSTED, {}, ORDER),
-                          Kind("replaces in vain", KEPT, {"GSTRATE": "12"}, ORDER),
+                          Kind("replaces in vain", KEPT, {"GSTRATE": "12"}, ORDER, True),
                           Kind("replaces a packed one", DROPPED, {}, PACKED, True),
                           CANCELS, CANCELS_NOTHING),
 }

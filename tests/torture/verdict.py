@@ -15,10 +15,8 @@ def violations(scenario, folder, program, last, *, earlier=()):
     found = run_violations(last)
     if last.status not in (0, 1):
         return found
-    # At most one run before it came as far as the backup.
-    settled_once = len(earlier) < 2
     found += store_violations(folder, scenario.file.expected_store())
-    found += file_violations(scenario, folder, last.posted(), settled_once)
+    found += file_violations(scenario, folder)
     found += written_violations(scenario, folder, [*earlier, last])
     found += leftovers(scenario, folder)
     found += log_violations(folder, program)
@@ -83,17 +81,11 @@ def read(path):
     return path.read_bytes() if path.exists() else b""
 
 
-def file_violations(scenario, folder, posted_last, settled_once):
+def file_violations(scenario, folder):
     content = read(folder / ORDER_FILE)
     kept = scenario.file.kept()
     if content == kept:
         return []
-    if scenario.file.trade.keeps_turned_away:
-        # What the struck runs posted and did not settle.
-        earlier = {order.number for order in scenario.file.posted()} - posted_last
-        left = {order.number for order in scenario.file.posted() if order.texts[0] in content.splitlines(True)}
-        if (left == earlier or (left < earlier and not settled_once)) and content == scenario.file.kept(left):
-            return []
     present = set(content.splitlines(True))
     lost = [order.number for order in scenario.file.orders
             if order.fate == KEPT and not present.issuperset(order.texts)]
@@ -116,12 +108,12 @@ def together_violations(_scenario, _folder):
     return []
 
 
-def written_violations(scenario, folder, runs):
+def written_violations(scenario, folder, _runs):
     """What has to hold of the files beside the order file; the last of the runs was a plain one."""
-    return backup_violations(scenario, folder, runs[-1].posted(), len(runs) < 3) if scenario.backup else []
+    return backup_violations(scenario, folder) if scenario.backup else []
 
 
-def backup_violations(scenario, folder, posted_last, settled_once):
+def backup_violations(scenario, folder):
     content = read(folder / BACKUP)
     if not content.startswith(EARLIER_BACKUP):
         return ["the backup has lost what it held before"]
@@ -134,19 +126,9 @@ def backup_violations(scenario, folder, posted_last, settled_once):
     strays = {owners[text].number for text in texts if not owners[text].is_stored()}
     if strays:
         return [f"the backup holds orders that were never posted: {sorted(strays)[:5]}"]
-    of_last = [whole(text) for order in scenario.file.posted() if order.number in posted_last
-               for text in order.texts]
-    earlier = texts[:len(texts) - len(of_last)]
-    if texts[len(earlier):] != of_last:
-        return ["the backup's end is not what the plain run posted"]
-    of_struck = [whole(text) for order in scenario.file.posted() if order.number not in posted_last
-                 for text in order.texts]
-    if settled_once and earlier not in ([], of_struck):
-        return ["the backup holds some, not all or none, of the lines that the struck run posted"]
-    present = set(earlier)
-    halves = {owners[text].number for text in earlier
-              if not present.issuperset(map(whole, owners[text].texts))}
-    return [f"the backup holds parts of orders: {sorted(halves)[:5]}"] if halves else []
+    present = set(texts)
+    lacking = [order.number for order in scenario.file.posted() if not present.issuperset(map(whole, order.texts))]
+    return [f"the backup lacks lines of {lacking[:5]}"] if lacking else []
 
 
 def new_files(scenario, folder):
@@ -158,8 +140,8 @@ def new_files(scenario, folder):
 
 def leftovers(scenario, folder):
     strange = new_files(scenario, folder)
-    if scenario.file.trade.keeps_turned_away:
-        strange.discard("inbox/orders.tmp")  # with nothing to settle, the next rewrite replaces it
+    # A draft of a killed program goes with the next rewrite; the runs behind it may have had nothing to settle.
+    strange = {name for name in strange if ".partnerkit-" not in name}
     return [f"left over: {sorted(strange)}"] if strange else []
 
 

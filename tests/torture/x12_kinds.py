@@ -36,7 +36,7 @@ COMMON = (
     Kind("without stores", POSTED, {"whole": True}),
     Kind("stored already", DROPPED, {}, ORDER, True),
     Kind("replaces", POSTED, purpose("07"), ORDER),
-    Kind("replaces in vain", KEPT, purpose("07", store="9999"), ORDER),
+    Kind("replaces in vain", KEPT, purpose("07", store="9999"), ORDER, True),
     Kind("replaces a packed one", DROPPED, purpose("07"), PACKED, True),
     Kind("after a half stored one", POSTED, {}, OTHER_HALF))
 FAULTS = (UNKNOWN_PRODUCT, OTHER_COST, Kind("half stored", POSTED, {}, HALF))
@@ -58,7 +58,7 @@ KINDS = {
                            Kind("blanket", POSTED, order_type("BK")),
                            Kind("release", POSTED, order_type("RL", release="2")),
                            Kind("changes", POSTED, change("05"), ORDER),
-                           Kind("change of an unknown product", KEPT, change("05"), ORDER),
+                           Kind("change of an unknown product", KEPT, change("05"), ORDER, True),
                            Kind("changes the dates of a packed one", DROPPED, change("05"), CHANGEABLE, True),
                            Kind("changes a packed one", KEPT, change("05"), PACKED, True),
                            Kind("cancels", CARRIED_OUT, change("01"), ORDER),

@@ -68,7 +68,7 @@ def written_violations(scenario, folder, runs):
     # Where the archive's own operations fail, the run goes on without.
     needed = last.order_file or any(run.status == -signal.SIGKILL for run in runs)
     return (acknowledgement_violations(scenario, folder, max(len(runs), 2))
-            + archive_violations(scenario, folder, [last] if last.order_file else runs, needed))
+            + archive_violations(scenario, folder, runs, needed))
 
 
 def together_violations(scenario, folder):
@@ -97,13 +97,17 @@ def acknowledgement_violations(scenario, folder, runs):
 
 
 def archive_violations(scenario, folder, runs, needed=False):
-    """The archive has the file as one of these runs found it."""
+    """The archive has the file as the first of these runs found it, and nothing that none of them found."""
     path = folder / ARCHIVE
     if not path.exists():
         return ["nothing was archived"] if needed and scenario.file.trade.archives else []
     if not scenario.file.trade.archives:
         return ["the file was archived"]
-    return [] if path.read_bytes() in [run.order_file for run in runs] else ["the archive is not the file as it came"]
+    copies = [copy.read_bytes() for copy in [path, *path.parent.glob(path.name + ".[0-9]*")]]
+    found = [run.order_file for run in runs if run.order_file]
+    if any(copy not in found for copy in copies):
+        return ["the archive has a file that never came"]
+    return [] if not found or any(copy.startswith(found[0]) for copy in copies) else ["the archive has lost the file as it came"]
 
 
 def leftovers(scenario, folder, earlier):
@@ -113,5 +117,6 @@ def leftovers(scenario, folder, earlier):
         # A run that was killed between the deletion of the order file and that of the temporary file leaves it, too.
         foreseen.add("inbox/orders.tmp")
     strange = [name for name in verdict.new_files(scenario, folder)
-               if name not in foreseen and not re.fullmatch(r"outbox/FA_PO_\d+_0603081015\.TXT", name)]
+               if name not in foreseen and ".partnerkit-" not in name
+               and not re.fullmatch(rf"outbox/FA_PO_\d+_0603081015\.TXT|{re.escape(ARCHIVE)}\.\d+", name)]
     return [f"left over: {strange}"] if strange else []
