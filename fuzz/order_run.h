@@ -104,7 +104,8 @@ class OrderRun : private ImportRun {
 
   static bool TakesBack(const LogRecord& last) {
     const std::string_view message = Str(last.Message);
-    return message.ends_with(". Order cancelled.") || message.starts_with("Cannot process CANCELLATION. Original PO ") ||
+    return message.ends_with(". Order cancelled.") ||
+           message.starts_with("Cannot process CANCELLATION. Original PO ") ||
            message.starts_with("... Warning Purchase Order Change Request Cancel Balance Of ");
   }
 

@@ -32,7 +32,7 @@ struct ClassRules {
   bool cancelsInFile = false;  // a cancellation stays in the file
   bool releases = false;       // a release goes by its version, too
   bool dropsBlankLines = false;
-  bool shortNumbers = false;       // a short number goes by its ship-to, too
+  bool shortNumbers = false;  // a short number goes by its ship-to, too
   bool keepsTurnedAway = false;
   bool linesMayNotCount = false;  // an order may be left without lines
 };

@@ -107,12 +107,10 @@ void PrintGrid(const Command& command, const RunReport& report, RecordStore& sto
 
 void PrintSummary(const Command& command, const RunReport& report) {
   command.out << '\n' << Counted(report.rows.Rows(), "row", "rows");
-  const std::pair<Outcome, std::string_view> outcomes[] = {{Outcome::kPosted, DoneWord(report)},
-                                                           {Outcome::kChanged, "changed"},
-                                                           {Outcome::kCancelled, "cancelled"},
-                                                           {Outcome::kDeleted, "deleted"},
-                                                           {Outcome::kStoredEarlier, "stored earlier"},
-                                                           {Outcome::kTurnedAway, "not done"}};
+  const std::pair<Outcome, std::string_view> outcomes[] = {
+      {Outcome::kPosted, DoneWord(report)},        {Outcome::kChanged, "changed"},
+      {Outcome::kCancelled, "cancelled"},          {Outcome::kDeleted, "deleted"},
+      {Outcome::kStoredEarlier, "stored earlier"}, {Outcome::kTurnedAway, "not done"}};
   for (const auto& [outcome, word] : outcomes) {
     const auto count = std::ranges::count(report.results, outcome, &RowResult::outcome);
     if (count > 0) command.out << ", " << count << ' ' << word;

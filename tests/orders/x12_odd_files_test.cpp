@@ -43,8 +43,7 @@ TEST(X12OddFilesTest, TellsWhyAnOrderIsRefused) {
       {"stores before any line", Order("450001", "SDQ*EA*92*0512*3~" + line + end),
        "segment SDQ*EA*92*0512*3 at byte {}: it stands before any line of the order. It stays in the file."},
       {"a number that can't be held", Order(longNumber, line + end),
-       "segment BEG*00*SA*" + longNumber.substr(0, 50) +
-           "... at byte {} is too long to be read. It stays in the file.",
+       "segment BEG*00*SA*" + longNumber.substr(0, 50) + "... at byte {} is too long to be read. It stays in the file.",
        false},
   };
   for (const auto& c : cases) {

@@ -14,7 +14,8 @@ class FaultyFiles : public Files {
   explicit FaultyFiles(Files& real) : real_(real) {}
 
   // After `passed` good ones, the next `times` operations `what` ("Length", "OpenInput", "OpenOutput", "OpenDraft",
-  // "Delete", "Rename", "Copy", "Read", "Write", "Sync" or "Truncate") on a file whose path ends in `name` raise `number`.
+  // "Delete", "Rename", "Copy", "Read", "Write", "Sync" or "Truncate") on a file whose path ends in `name` raise
+  // `number`.
   void Fail(std::string what, std::string name, std::int32_t number, int times = 1, int passed = 0) {
     fault_ = {std::move(what), std::move(name), number, times, passed};
   }
