@@ -130,9 +130,8 @@ class Run {
     report_.withResults = withResults;
     report_.logIds = host_.LogIds();
     PrintRun(command_, report_, host_.Records());
-    workspace_.Host().Close();
-    SayUnstored();
-    return workspace_.HadFault() ? kTurnedAway : status_;
+    const bool stored = workspace_.CloseStore();
+    return workspace_.HadFault() || !stored ? kTurnedAway : status_;
   }
 
  private:
@@ -160,15 +159,6 @@ class Run {
     status_ = kTurnedAway;
     command_.Say(file_ + ": the store failed: " + workspace_.Host().LastFault() +
                  (untried > 0 ? "; " + Counted(untried, "row", "rows") + " not tried" : ""));
-  }
-
-  void SayUnstored() {
-    const std::size_t unstored = workspace_.Host().UnstoredLogRecords();
-    if (unstored == 0) return;
-    const std::string& fault = workspace_.Host().LastFault();
-    command_.Say(Counted(unstored, "log record", "log records") + " could not be stored" +
-                 (fault.empty() ? "" : ": " + fault));
-    status_ = kTurnedAway;
   }
 
   // A posting leaves information. Warnings alone tell of a stored order that was cancelled or changed in place, and its
