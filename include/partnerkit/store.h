@@ -100,9 +100,13 @@ class System {
   virtual bool DeleteOrder(const Order& order) = 0;
   // Makes all that was stored since the last one durable. The argument is the host's; the library passes 0.
   virtual void Commit(std::int32_t mode) = 0;
-  // A transaction around one posting. What was stored before it is made durable first.
+  // A transaction around one posting. What was stored before it is made durable first. Records of the run log (`Log`)
+  // are no part of it, nor of anything that the store takes back by itself: a host keeps what was added and writes it
+  // again, under the id that it had, for that id has been shown to others and must never be given to another record. A
+  // record that waits is found by its id, and no failure to write it fails a commit.
   virtual void BeginTrans() = 0;
   virtual void CommitTrans() = 0;
+  // Takes back all that was stored since BeginTrans but the log records.
   virtual void RollbackTrans() = 0;
   // All document definitions, by `EDIDocId`.
   virtual std::vector<EDIDoc> EDIDocList() = 0;

@@ -110,8 +110,8 @@ int PreviewLabel(const Command& command, const std::string& className, std::int3
   if (drawn) WriteWhole(*ports.files, file, printer.Document());
   workspace.Host().Commit(0);
   Report(command, file, packId, drawn, host, workspace.Host().Records());
-  workspace.Host().Close();
-  return drawn && !workspace.HadFault() ? kDone : kTurnedAway;
+  const bool stored = workspace.CloseStore();
+  return drawn && stored && !workspace.HadFault() ? kDone : kTurnedAway;
 }
 
 }  // namespace partnerkit::cli

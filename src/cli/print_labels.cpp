@@ -73,8 +73,8 @@ class LabelRun {
     Report();
     const bool all = std::ranges::all_of(results_, &Result::printed);
     const bool logged = !host_.LogIds().empty();
-    workspace_.Host().Close();
-    return all && !logged && !workspace_.HadFault() ? kDone : kTurnedAway;
+    const bool stored = workspace_.CloseStore();
+    return all && !logged && stored && !workspace_.HadFault() ? kDone : kTurnedAway;
   }
 
  private:

@@ -100,7 +100,8 @@ class Run {
       ProcessRow(static_cast<std::int32_t>(row));
       progress_.Show("processing", report_.results.size(), rows.size());
     }
-    if (StoreFailed()) GiveUp(rows.size() - report_.results.size());
+    report_.untried = rows.size() - report_.results.size();
+    if (StoreFailed()) GiveUp();
   }
 
   // The lines of finished rows leave the file only once the store holds for good what became of them.
@@ -130,9 +131,8 @@ class Run {
     report_.withResults = withResults;
     report_.logIds = host_.LogIds();
     PrintRun(command_, report_, host_.Records());
-    workspace_.Host().Close();
-    SayUnstored();
-    return workspace_.HadFault() ? kTurnedAway : status_;
+    const bool stored = workspace_.CloseStore();
+    return workspace_.HadFault() || !stored ? kTurnedAway : status_;
   }
 
  private:
@@ -155,21 +155,12 @@ class Run {
 
   // Behind a failing store nothing more is tried. What is done was durable before it counted as done, so it may be
   // settled whatever the store has lost.
-  void GiveUp(std::size_t untried) {
+  void GiveUp() {
     progress_.Clear();
     workspace_.Host().Recover();
     status_ = kTurnedAway;
     command_.Say(file_ + ": the store failed: " + workspace_.Host().LastFault() +
-                 (untried > 0 ? "; " + Counted(untried, "row", "rows") + " not tried" : ""));
-  }
-
-  void SayUnstored() {
-    const std::size_t unstored = workspace_.Host().UnstoredLogRecords();
-    if (unstored == 0) return;
-    const std::string& fault = workspace_.Host().LastFault();
-    command_.Say(Counted(unstored, "log record", "log records") + " could not be stored" +
-                 (fault.empty() ? "" : ": " + fault));
-    status_ = kTurnedAway;
+                 (report_.untried > 0 ? "; " + Counted(report_.untried, "row", "rows") + " not tried" : ""));
   }
 
   // A posting leaves information. Warnings alone tell of a stored order that was cancelled or changed in place, and its

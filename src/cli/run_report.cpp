@@ -115,6 +115,7 @@ void PrintSummary(const Command& command, const RunReport& report) {
     const auto count = std::ranges::count(report.results, outcome, &RowResult::outcome);
     if (count > 0) command.out << ", " << count << ' ' << word;
   }
+  if (report.untried > 0) command.out << ", " << report.untried << " not tried";
   command.out << ".\n";
 }
 

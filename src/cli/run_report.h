@@ -27,6 +27,7 @@ struct RunReport {
   bool withResults = false;
   bool outbound = false;  // a row is compiled, not posted
   std::vector<RowResult> results;
+  std::size_t untried = 0;           // rows behind a failing store
   std::vector<std::int32_t> logIds;  // every log record of the run
 };
 

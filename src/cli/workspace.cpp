@@ -3,6 +3,7 @@
 #include <cstdlib>
 #include <vector>
 
+#include "cli/table.h"
 #include "cli/text.h"
 #include "partnerkit/platform.h"
 #include "partnerkit/run_time_error.h"
@@ -118,6 +119,16 @@ Workspace::Workspace(const Command& command) : command_(command), folder_(Checke
 }
 
 Workspace::~Workspace() { TellRepeats(); }
+
+bool Workspace::CloseStore() {
+  host_->Close();
+  const std::size_t unstored = host_->UnstoredLogRecords();
+  if (unstored == 0) return true;
+  const std::string& fault = host_->LastFault();
+  command_.Say(Counted(unstored, "log record", "log records") + " could not be stored" +
+               (fault.empty() ? "" : ": " + fault));
+  return false;
+}
 
 // A store that fails does so for every record; it is said once, and counted.
 void Workspace::Tell(const std::string& report) {

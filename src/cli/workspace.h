@@ -32,6 +32,8 @@ class Workspace {
 
   const std::filesystem::path& Folder() const { return folder_; }
   host::SqlHost& Host() { return *host_; }
+  // Closes the store. False when the log has not got all that was written to it, which is said. Raises RunTimeError.
+  bool CloseStore();
   const Ports& ClassPorts() const { return ports_; }
   // An error reached the error trail; it is on standard error.
   bool HadFault() const { return hadFault_; }

@@ -48,8 +48,8 @@ class Rider {
 // explicit one. Reading opens neither.
 //
 // A full disk or a failing device makes SQLite take back the whole transaction by itself. What was stored since the
-// last commit is then lost, and every `Commit` says so until the next change or `Begin` opens a new transaction: a
-// caller that commits again must not take the second call's success for the first one's.
+// last commit is then lost, and every `Commit` says so until the next change or `Begin` opens a new transaction, or
+// until `Recover`: a caller that commits again must not take the second call's success for the first one's.
 class SqlSession {
  public:
   // `url` is a file path, with or without "sqlite3://" before it. Raises RunTimeError.

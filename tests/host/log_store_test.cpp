@@ -1,7 +1,5 @@
 #include "host/log_store.h"
 
-#include <gmock/gmock.h>
-
 #include <csignal>
 
 #include "host/sql_host.h"
@@ -9,8 +7,6 @@
 
 namespace partnerkit::host {
 namespace {
-
-using ::testing::ElementsAre;
 
 class LogStoreTest : public StoreTest {
  protected:

@@ -13,6 +13,7 @@ import subprocess
 import tempfile
 import threading
 
+import told
 import verdict
 from workspace import BACKUP, ORDER_FILE, Scenario
 
@@ -291,6 +292,7 @@ def several_programs(case, kill_after=None):
         return ended
 
     runs = all_at_once()
+    every = [*runs]
     for ended in runs:
         case.expect(ended, (0, 1, -signal.SIGKILL) if kill_after else (0, 1))
     if kill_after:
@@ -298,6 +300,8 @@ def several_programs(case, kill_after=None):
         runs = all_at_once()
         for ended in runs:
             case.expect(ended, (0, 1))
+        every += runs
+    case.found += told.violations(case.folder, every)
     of_class = case.trade.verdict
     for index, (file, last) in enumerate(zip(files, runs)):
         case.found += of_class.left_violations(file, case.folder / f"inbox/{index}.edi", last, 2)

@@ -20,6 +20,7 @@ COLUMNS = ("CONTAINERNO", "SHIPNOTENO", "CONSIGNMENTNOTENO", "ORDERNO", "APN", "
 PRODUCTS = ("9312345000012", "9312345000029", "9312345000036")
 EARLIER = b"what was sent last week\r\n"
 INVENTORY = "outbox/stock.csv"
+TOLD_OF = {"stored": "SELECT Id, OrderNo FROM tbASN", "column": 3}
 WAITING = "SELECT COUNT(*) FROM tbPack WHERE Status < 8"
 
 # shipments, orders of each, packs of each of these; where the notices go; what stands there from an earlier week.
@@ -132,7 +133,7 @@ class NoticeTrade:
         if last.status in (0, 1):
             found += store_violations(scenario, folder, [scenario.output])
             found += verdict.log_violations(folder, program)
-            found += told.violations(folder, [*earlier, last], stored="SELECT Id, OrderNo FROM tbASN", column=3)
+            found += told.violations(folder, [*earlier, last], **TOLD_OF)
         return found
 
 
@@ -218,17 +219,17 @@ def single_violations(scenario, path, notices):
 
 def together(program, scenario, folder, outputs, kill_after=None):
     """One program for each output, run at once until nothing waits; the first ones may be killed meanwhile."""
-    found = []
+    found, ended = [], []
     for turn in range(12):
         runs = [program.start(folder, "process", "1", output) for output in outputs]
         timers = [threading.Timer(kill_after * (index + 1), run.kill) for index, run in enumerate(runs)
                   if kill_after and turn == 0]
         for timer in timers:
             timer.start()
-        readers = [threading.Thread(target=program.finish, args=[run]) for run in runs[1:]]
+        readers = [threading.Thread(target=lambda run=run: ended.append(program.finish(run))) for run in runs[1:]]
         for reader in readers:
             reader.start()
-        program.finish(runs[0])
+        ended.append(program.finish(runs[0]))
         for thread in readers + timers:
             thread.join()
         bad = [run.returncode for run in runs if run.returncode not in (0, 1, -signal.SIGKILL)]
@@ -242,6 +243,7 @@ def together(program, scenario, folder, outputs, kill_after=None):
     # What killed runs left is taken up by the next.
     for output in outputs:
         program.process(folder, name=output)
+    found += told.violations(folder, ended, **TOLD_OF)
     return found + store_violations(scenario, folder, sorted(set(outputs))) + verdict.log_violations(folder, program)
 
 

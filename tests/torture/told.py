@@ -51,7 +51,7 @@ def row_violations(report, messages, numbers, column):
         wrong = [text for text in told if text == "no message" or not others.isdisjoint(re.findall(r"\w+", text))]
         if wrong:
             found.append(f"the row of {own} is told by {wrong[0]!r}")
-        done = result["result"] and any("completed" in text for text in told)
+        done = any("completed." in text for text in told)
         if done and numbers.get(result["result"]) != own:
             found.append(f"{own} is told to be posted, and {numbers.get(result['result'])} is stored under that id")
     return found
