@@ -1,6 +1,10 @@
 #include "cli/workspace.h"
 
+#include <sys/stat.h>
+
+#include <cerrno>
 #include <cstdlib>
+#include <cstring>
 #include <vector>
 
 #include "cli/text.h"
@@ -16,6 +20,9 @@ namespace {
 // maps: column-name maps. inbox: what partners sent. outbox: what goes to them. backup: lines of posted orders.
 // spool: print jobs.
 constexpr std::string_view kFolders[] = {"maps", "inbox", "outbox", "backup", "spool"};
+
+// None for others: a supplier's prices and orders are in there.
+constexpr mode_t kFolderRights = S_IRWXU | S_IRWXG;
 
 fs::path ChosenFolder(const Options& options) {
   if (!options.workspace.empty()) return AbsolutePath(options.workspace);
@@ -51,12 +58,13 @@ class MadeFolders {
     std::error_code ignored;
     for (auto folder = made_.rbegin(); folder != made_.rend(); ++folder) fs::remove(*folder, ignored);
   }
-  void Make(const fs::path& folder) {
+  void Make(const fs::path& folder, mode_t rights = kFolderRights) {
     std::error_code failure;
     if (fs::is_directory(folder, failure)) return;
-    if (folder.has_parent_path() && folder.parent_path() != folder) Make(folder.parent_path());
-    fs::create_directory(folder, failure);
-    if (failure) throw Refusal(folder.string() + ": cannot be made: " + failure.message());
+    if (folder.has_parent_path() && folder.parent_path() != folder) Make(folder.parent_path(), ACCESSPERMS);
+    if (::mkdir(folder.c_str(), rights) != 0) {
+      throw Refusal(folder.string() + ": cannot be made: " + std::strerror(errno));
+    }
     made_.push_back(folder);
   }
   void Keep() { made_.clear(); }

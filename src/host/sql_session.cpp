@@ -1,5 +1,8 @@
 #include "host/sql_session.h"
 
+#include <fcntl.h>
+#include <unistd.h>
+
 #include <filesystem>
 #include <system_error>
 #include <thread>
@@ -42,13 +45,25 @@ std::string FileOf(std::string_view url) {
   Refuse(url, "unknown kind of database");
 }
 
+// An empty file, which SQLite takes for a new database. It gives the files beside it the same rights: others have none,
+// for prices stand in them. What fails here fails in SQLite again.
+void MakePrivate(const std::string& file) {
+  const int made = ::open(file.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, S_IRUSR | S_IWUSR | S_IRGRP | S_IWGRP);
+  if (made >= 0) ::close(made);
+}
+
 void CheckFile(const std::string& file, bool create) {
   if (file.empty()) Refuse("database", "no file is named");
   if (file == ":memory:") return;
   std::error_code error;
   const auto status = std::filesystem::status(file, error);
   if (std::filesystem::is_directory(status)) Refuse(file, "is a folder, not a database");
-  if (!create && status.type() == std::filesystem::file_type::not_found) Refuse(file, "there is no such database");
+  const bool there = status.type() != std::filesystem::file_type::not_found;
+  if (!create && !there) Refuse(file, "there is no such database");
+  if (!create && std::filesystem::file_size(file, error) == 0) {
+    Refuse(file, "is empty, and was a database: bring it back from a backup, or remove it and make a new one");
+  }
+  if (create && !there) MakePrivate(file);
 }
 
 // SOCI's connection text is a list of name=value; a path with a "=" has to be quoted, and only then may it not hold a

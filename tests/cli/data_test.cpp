@@ -97,6 +97,16 @@ TEST_F(Data, ReplacesByKeyAsAWhole) {
   EXPECT_EQ(all["System"], nlohmann::json::parse(R"({"CompanyName": "Acme Apparel", "ComPort": "LPT1"})"));
 }
 
+TEST_F(Data, NeverTakesAPartnersNumbersBack) {
+  Put(R"({"Partner": [{"PartnerId": "P1", "LastASNNo": 7, "LastInterchangeNo": 8, "LastGroupNo": 9}]})");
+  Put(R"({"Partner": [{"PartnerId": "P1", "City": "Geelong", "LastInterchangeNo": 5, "LastGroupNo": 12}]})");
+  const auto stored = Json({"data", "dump", "Partner"})["Partner"][1];
+  EXPECT_EQ(stored["City"], "Geelong");
+  EXPECT_EQ(stored["LastASNNo"], 7);
+  EXPECT_EQ(stored["LastInterchangeNo"], 8);
+  EXPECT_EQ(stored["LastGroupNo"], 12);
+}
+
 TEST_F(Data, FindsTheOwnerInTheStoreOrInAnyFileOfTheLoad) {
   folder.Write("lines.json", R"({"OrderLine": [{"OrderId": 30, "ProductNo": "A"}]})");
   folder.Write("order.json", R"({"Order": [{"OrderId": 30, "PONo": "N30"}]})");

@@ -1,4 +1,7 @@
 #include <gmock/gmock.h>
+#include <sys/stat.h>
+
+#include <iterator>
 
 #include "cli/supplier.h"
 
@@ -57,6 +60,14 @@ TEST_F(Usage, RefusesADatabaseThatIsNone) {
   folder.Write("partnerkit.db", std::string(4096, 'x'));
   ExpectRefused({"docs"}, "partnerkit.db: file is not a database");
   EXPECT_EQ(folder.Read("partnerkit.db"), std::string(4096, 'x'));
+  folder.Write("partnerkit.db", "");
+  for (const char* command : {"docs", "data dump", "process 1 inbox/orders.csv", "print clsCMLSCM --pack 1", "log"}) {
+    std::istringstream words{std::string(command)};
+    ExpectRefused({std::istream_iterator<std::string>(words), {}},
+                  "partnerkit.db: is empty, and was a database: bring it back from a backup, or remove it");
+  }
+  ExpectRefused({"new", "."}, "is a workspace already");
+  EXPECT_EQ(folder.Read("partnerkit.db"), "");
 }
 
 TEST_F(Usage, FindsTheWorkspaceByOptionThenEnvironmentThenFolder) {
@@ -78,6 +89,20 @@ TEST_F(Usage, LeavesNothingWhereAWorkspaceCannotBeMade) {
   const Ran ran = Run({"--database", "postgresql://nowhere/db", "new", "a/b"});
   EXPECT_EQ(ran.status, 2);
   EXPECT_FALSE(folder.Has("a"));
+}
+
+TEST_F(Usage, AWorkspaceIsNoneOfOthersBusiness) {
+  const mode_t before = umask(0022);
+  EXPECT_EQ(Run({"new", "our/mine"}).status, 0);
+  EXPECT_EQ(Run({"--database", "our/mine/more.db", "docs"}).status, 0);
+  umask(before);
+  const std::pair<const char*, int> table[] = {{"our", 0755},
+                                               {"our/mine", 0750},
+                                               {"our/mine/spool", 0750},
+                                               {"our/mine/partnerkit.db", 0640},
+                                               {"our/mine/more.db", 0640}};
+  for (const auto& [name, rights] : table)
+    EXPECT_EQ(static_cast<int>(std::filesystem::status(folder / name).permissions()), rights) << name;
 }
 
 TEST_F(Usage, EveryVerbHasAnExample) {
