@@ -73,7 +73,7 @@ Times Load(const char* sourcePath, const char* targetPath, const std::string& ta
       watch = Stopwatch();
       Insert(rows, insert);
       times.rows += rows.size();
-    } while (!rows.empty());
+    } while (rows.size() == kRowsAtATime);
     target.Run("COMMIT");
   }
   times.Add(watch);

@@ -14,7 +14,7 @@ def write_prices(path, count):
     chance = random.Random("prices")
     with path.open("w") as file:
         file.write('{"ProductPrice": [')
-        for number in chance.sample(range(10**9), count):
+        for number in range(0, 613 * count, 613):
             cost = chance.randrange(400, 8000)
             price = {"VendorId": "ACME", "ProductNo": f"9312{number:09d}", "SKU": f"{number % 10**7:07d}",
                      "Cost": cost / 100, "Retail": cost // 50 + 0.95, "TaxRate": "10", "DeptNo": f"{cost % 40 + 300}"}
@@ -65,4 +65,4 @@ class LoadBench(Bench):
         self.print_line("data load", "ours", "bare", None)
         self.compare(f"{many} prices : bare inserts", lambda: self.load(many), self.bare, 3.0)
         self.print_line("  its memory : 60 MB", f"{self.memory / 1e6:.1f} MB", "60.0 MB", 1.0, self.memory / MEMORY)
-        self.compare(f"a price of {many} : of {few}", lambda: self.load_each(many), lambda: self.load_each(few), 1.5, "us")
+        self.compare(f"a price of {many} : of {few}", lambda: self.load_each(many), lambda: self.load_each(few), 1.15, "us")

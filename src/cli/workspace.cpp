@@ -34,6 +34,7 @@ std::unique_ptr<host::SqlHost> OpenStore(const std::string& url, bool create) {
   try {
     host::SqlOptions options;
     options.create = create;
+    options.relativePaths = true;
     return host::SqlHost::Open(url, options);
   } catch (const RunTimeError& error) {
     throw Refusal(error.Description());

@@ -18,6 +18,8 @@ constexpr std::chrono::microseconds kPoll{500};
 constexpr std::chrono::milliseconds kTurn{1};
 constexpr std::chrono::milliseconds kTurnEvery{100};
 
+constexpr std::string_view kInMemory = ":memory:";
+
 constexpr Dialect kSqlite = {
     .idColumn = "INTEGER PRIMARY KEY",
     .lastingIdColumn = "INTEGER PRIMARY KEY AUTOINCREMENT",
@@ -54,7 +56,7 @@ void MakePrivate(const std::string& file) {
 
 void CheckFile(const std::string& file, bool create) {
   if (file.empty()) Refuse("database", "no file is named");
-  if (file == ":memory:") return;
+  if (file == kInMemory) return;
   std::error_code error;
   const auto status = std::filesystem::status(file, error);
   if (std::filesystem::is_directory(status)) Refuse(file, "is a folder, not a database");
@@ -64,6 +66,10 @@ void CheckFile(const std::string& file, bool create) {
     Refuse(file, "is empty, and was a database: bring it back from a backup, or remove it and make a new one");
   }
   if (create && !there) MakePrivate(file);
+}
+
+std::string FolderOf(const std::string& file) {
+  return std::filesystem::absolute(file).lexically_normal().parent_path().string();
 }
 
 // SOCI's connection text is a list of name=value; a path with a "=" has to be quoted, and only then may it not hold a
@@ -89,6 +95,7 @@ std::string Quoted(std::string_view identifier) {
 SqlSession::SqlSession(std::string_view url, const SqlOptions& options)
     : name_(FileOf(url)), options_(options), dialect_(&kSqlite), lastTurn_(steady_clock::now()) {
   CheckFile(name_, options.create);
+  if (options.relativePaths && name_ != kInMemory) paths_ = KeptPaths(FolderOf(name_));
   try {
     soci_.open(soci::sqlite3, ConnectionText(name_));
   } catch (const soci::soci_error&) {
