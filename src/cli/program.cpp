@@ -9,17 +9,26 @@
 #include "cli/command.h"
 #include "cli/data_commands.h"
 #include "cli/demo.h"
+#include "cli/example.h"
 #include "cli/json_writer.h"
 #include "cli/listings.h"
 #include "cli/print_labels.h"
 #include "cli/printers.h"
 #include "cli/run_document.h"
+#include "cli/text.h"
 #include "cli/workspace.h"
 #include "partnerkit/version.h"
 
 namespace partnerkit::cli {
 
 namespace {
+
+constexpr std::string_view kNextSteps =
+    "  partnerkit classes                             # every document of every partner\n"
+    "  partnerkit data example clsMGB850csv --out .   # records, map and order file of one, to be filled in\n"
+    "  partnerkit data load clsMGB850csv.json\n"
+    "  partnerkit docs                                # what is defined now\n"
+    "  partnerkit process 1 inbox/orders.csv\n";
 
 int MakeNew(const Command& command, const std::string& folder) {
   const std::filesystem::path made = MakeWorkspace(folder, command.options.database);
@@ -30,7 +39,10 @@ int MakeNew(const Command& command, const std::string& folder) {
     json.String(made.string());
     json.EndObject();
   } else {
-    command.out << "Made the workspace " << made.string() << ".\n";
+    command.out << "Made the workspace " << OneLine(made.string())
+                << ". What comes next, for instance with MGB's orders:\n\n"
+                << "  cd " << OneLine(folder) << "\n"
+                << kNextSteps;
   }
   return kDone;
 }
@@ -123,6 +135,14 @@ class Verbs {
   void AddDataVerbs() {
     CLI::App* data = Add(app_, "data", "Store records from JSON, or write them as JSON", "data load records.json");
     data->require_subcommand(1);
+    CLI::App* example = Add(*data, "example", "Write a first set of records for a class, to be filled in",
+                            "data example PartnerKit.clsMGB850csv --out .",
+                            [this](const Command& command) { return WriteExample(command, document_, file_); });
+    Required(example, "CLASS", document_, "The class, as `classes` lists it; its last part alone will do");
+    example
+        ->add_option("--out", file_,
+                     "Write a records file into this folder, and the map and the order file that it names")
+        ->type_name("DIR");
     CLI::App* load = Add(*data, "load", "Store the records of all files, or none of them", "data load records.json",
                          [this](const Command& command) { return LoadData(command, words_); });
     load->add_option("FILE", words_, "JSON files of records by kind")->required()->type_name("");
