@@ -18,6 +18,7 @@ import order_samples
 from barcodes import BarcodeBench
 from drawing import DrawingBench
 from labels import LabelBench
+from loading import LoadBench
 from notices import NoticesBench
 from x12 import X12Bench
 from yardsticks import BUILD, Bench, Failure
@@ -29,14 +30,14 @@ BYTES_PER_ORDER = 60_000
 
 MODEL, SLOWEST = "clsMGB850csv", "clsColesEIDCPOcsv"
 OTHERS = {"x12": X12Bench, "barcode": BarcodeBench, "drawing": DrawingBench, "labels": LabelBench,
-          "notices": NoticesBench}
+          "notices": NoticesBench, "load": LoadBench}
 
 FULL = {"runs": 3, "bytes": 150_000_000, "orders": 2_000, "many": 20_000, "segments": 10_000_000,
-        "barcodes": 1_000_000, "labels": 5_000, "cartons": 100_000, "shipments": 1_000}
+        "barcodes": 1_000_000, "labels": 5_000, "cartons": 100_000, "shipments": 1_000, "records": 1_000_000}
 SURVEY = {"runs": 3, "bytes": 15_000_000, "orders": 500, "many": 1_500, "segments": 1_000_000,
-          "barcodes": 100_000, "labels": 500, "cartons": 10_000, "shipments": 300}
+          "barcodes": 100_000, "labels": 500, "cartons": 10_000, "shipments": 300, "records": 100_000}
 QUICK = {"runs": 1, "bytes": 3_000_000, "orders": 60, "many": 200, "segments": 100_000,
-         "barcodes": 10_000, "labels": 50, "cartons": 1_000, "shipments": 20}
+         "barcodes": 10_000, "labels": 50, "cartons": 1_000, "shipments": 20, "records": 1_000}
 
 
 def check_space(sizes):
@@ -51,7 +52,7 @@ def main():
                                      formatter_class=argparse.RawDescriptionHelpFormatter)
     parser.add_argument("--quick", action="store_true", help="small sizes, once each: shows that it runs, not how fast")
     parser.add_argument("--class", dest="named", help="one CSV class instead, or all, these at a smaller size, or x12,"
-                        " barcode, drawing, labels, notices")
+                        " barcode, drawing, labels, notices, load")
     parser.add_argument("--cpu", action="store_true", help="compare processor time")
     parser.add_argument("--runs", type=int, help="how often each side runs (%d)" % FULL["runs"])
     options = parser.parse_args()

@@ -2,13 +2,12 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <cstddef>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
-#include <nlohmann/json.hpp>
-#include <set>
-#include <sstream>
-#include <utility>
+#include <iterator>
+#include <string_view>
 #include <vector>
 
 #include "cli/command.h"
@@ -20,70 +19,86 @@ namespace {
 
 using nlohmann::json;
 
-std::string ReadWhole(const std::string& path) {
-  std::error_code failure;
-  if (std::filesystem::is_directory(path, failure)) throw Refusal(path + ": is a folder");
-  std::ifstream file(path, std::ios::binary);
-  std::ostringstream text;
-  if (!file || (file.peek() != std::ifstream::traits_type::eof() && !(text << file.rdbuf()))) {
-    throw Refusal(path + ": cannot be read: " + std::strerror(errno));
-  }
-  return std::move(text).str();
-}
-
-// "line 3, column 17" of the byte before `end`, the last one read.
-std::string Place(std::string_view text, std::size_t end) {
-  const std::string_view before = text.substr(0, end == 0 ? 0 : end - 1);
-  const auto line = 1 + std::ranges::count(before, '\n');
-  const std::size_t start = before.rfind('\n') + 1;  // npos + 1 is 0
-  return "line " + std::to_string(line) + ", column " + std::to_string(Width(Utf8(before.substr(start))) + 1);
-}
-
-// The cause alone: the parser puts its own name and place before it.
-std::string Cause(std::string_view message) {
-  for (const std::string_view lead : {"[json.exception.", "parse error"}) {
-    if (message.starts_with(lead))
-      message.remove_prefix(std::min(message.size(), message.find(lead[0] == '[' ? ']' : ':') + 2));
-  }
-  return OneLine(message);
-}
-
-// Turns away an object that names a member twice; the parser would keep the last.
-class NamesOnce {
+// A file's bytes one by one, and where the last of them stands.
+class Bytes {
  public:
-  bool operator()(int, json::parse_event_t event, const json& value) {
-    if (event == json::parse_event_t::object_start) names_.emplace_back();
-    if (event == json::parse_event_t::object_end) names_.pop_back();
-    if (event == json::parse_event_t::key && !names_.back().insert(value.get<std::string>()).second) {
-      throw Refusal(value.dump() + " is given twice");
+  explicit Bytes(const std::string& path) : path_(path), block_(kBlock) {
+    std::error_code failure;
+    if (std::filesystem::is_directory(path, failure)) throw Refusal(path + ": is a folder");
+    errno = 0;
+    file_.open(path, std::ios::binary);
+    if (!file_) Refuse();
+    Fill();
+  }
+
+  bool AtEnd() const { return at_ == end_; }
+  char Current() const { return block_[at_]; }
+  void Next() {
+    const char c = block_[at_];
+    if (newLine_) {
+      ++line_;
+      column_ = 0;
     }
-    return true;
+    newLine_ = c == '\n';
+    if ((static_cast<unsigned char>(c) & 0xC0) != 0x80) ++column_;
+    if (++at_ == end_) Fill();
+  }
+
+  // "line 3, column 17"
+  std::string Place() const {
+    return "line " + std::to_string(line_) + ", column " + std::to_string(std::max<std::size_t>(column_, 1));
   }
 
  private:
-  std::vector<std::set<std::string>> names_;
+  static constexpr std::size_t kBlock = 1 << 18;
+
+  void Fill() {
+    file_.read(block_.data(), static_cast<std::streamsize>(block_.size()));
+    if (file_.bad()) Refuse();
+    at_ = 0;
+    end_ = static_cast<std::size_t>(file_.gcount());
+  }
+  [[noreturn]] void Refuse() const { throw Refusal(path_ + ": cannot be read: " + std::strerror(errno)); }
+
+  const std::string& path_;
+  std::ifstream file_;
+  std::vector<char> block_;
+  std::size_t at_ = 0, end_ = 0;
+  std::size_t line_ = 1, column_ = 0;
+  bool newLine_ = false;  // the last byte ended a line
+};
+
+// What the parser walks with. Copies walk together.
+class Walk {
+ public:
+  using iterator_category = std::input_iterator_tag;
+  using value_type = char;
+  using difference_type = std::ptrdiff_t;
+  using pointer = const char*;
+  using reference = char;
+
+  explicit Walk(Bytes* bytes) : bytes_(bytes) {}
+  char operator*() const { return bytes_->Current(); }
+  Walk& operator++() {
+    bytes_->Next();
+    return *this;
+  }
+  // It is only asked whether the end has come.
+  bool operator==(const Walk&) const { return bytes_->AtEnd(); }
+
+ private:
+  Bytes* bytes_;
 };
 
 }  // namespace
 
-json ReadDataFile(const std::string& path) {
-  std::istringstream text(ReadWhole(path));
-  const auto refuse = [&](const std::string& cause) {
-    const auto read = text.rdbuf()->pubseekoff(0, std::ios::cur, std::ios::in);
-    const std::string_view all = text.view();
-    const std::size_t end = read < 0 ? all.size() : static_cast<std::size_t>(read);
-    return Refusal(path + ": " + Place(all, end) + ": " + cause);
-  };
-  json data;
+void ReadDataFile(const std::string& path, JsonEvents& events) {
+  Bytes bytes(path);
   try {
-    data = json::parse(text, NamesOnce());
-  } catch (const json::exception& error) {
-    throw refuse(Cause(error.what()));
-  } catch (const Refusal& refusal) {
-    throw refuse(refusal.what());
+    json::sax_parse(Walk(&bytes), Walk(&bytes), &events);
+  } catch (const SyntaxFault& fault) {
+    throw Refusal(path + ": " + bytes.Place() + ": " + OneLine(fault.what()));
   }
-  if (!data.is_object()) throw Refusal(path + ": wants one JSON object with an array of records for each kind");
-  return data;
 }
 
 }  // namespace partnerkit::cli

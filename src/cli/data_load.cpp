@@ -1,197 +1,87 @@
-#include <limits>
 #include <map>
 #include <memory>
-#include <nlohmann/json.hpp>
 #include <string>
-#include <type_traits>
+#include <unordered_set>
 #include <utility>
 #include <vector>
 
 #include "cli/data_commands.h"
-#include "cli/data_file.h"
+#include "cli/data_reader.h"
 #include "cli/json_writer.h"
 #include "cli/record_json.h"
 #include "cli/table.h"
 #include "cli/workspace.h"
+#include "host/table_sql.h"
 
 namespace partnerkit::cli {
 
 namespace {
 
-using nlohmann::json;
-
-// A record of a file, with what stands inside it.
-struct Item {
-  const std::string* file;
-  std::size_t index;
-  std::shared_ptr<void> record;
-  std::vector<std::shared_ptr<void>> parts;
-};
-
-struct Data {
-  std::map<const RecordType*, std::vector<Item>> records;
+// What was stored: of each kind named, how many records, and the settings.
+struct Loaded {
+  std::map<const RecordType*, std::size_t> records;
   std::map<std::string, std::string, std::less<>> settings;
 };
 
-[[noreturn]] void RefuseAt(const std::string& file, const std::string& place, const std::string& cause) {
-  throw Refusal(file + ": " + place + ": " + cause);
-}
-
-std::string Indexed(std::string_view name, std::size_t index) {
-  return std::string(name) + "[" + std::to_string(index) + "]";
-}
-
-// --- From JSON to structs. Nothing is stored before all files have passed.
-
-class Reader {
- public:
-  Reader(const std::string& file, std::string workspace, Data& data)
-      : file_(file), workspace_(std::move(workspace)), data_(data) {}
-
-  void Read() {
-    const json all = ReadDataFile(file_);
-    for (const auto& [kind, value] : all.items()) {
-      if (kind == "System") {
-        ReadSettings(value);
-      } else {
-        ReadKind(kind, value);
-      }
-    }
-  }
-
- private:
-  void ReadSettings(const json& value) {
-    if (!value.is_object()) RefuseAt(file_, "System", "wants one object, not an array or a value");
-    for (const auto& given : value.items()) {
-      const std::string place = "System." + given.key();
-      const Setting* setting = FindSetting(given.key());
-      if (setting == nullptr) RefuseAt(file_, place, "no such setting");
-      data_.settings[given.key()] = Placed(place, [&] { return SettingText(*setting, given.value(), workspace_); });
-    }
-  }
-
-  void ReadKind(const std::string& kind, const json& value) {
-    const RecordType* type = FindRecordType(kind);
-    if (type == nullptr) RefuseAt(file_, kind, "no such kind of record");
-    if (const NestedKind* nested = NestedIn(*type)) {
-      RefuseAt(file_, kind,
-               "stands inside " + std::string(nested->owner->kind) + " records, as " + std::string(nested->member));
-    }
-    if (!value.is_array()) RefuseAt(file_, kind, "wants an array of records");
-    std::vector<Item>& items = data_.records[type];
-    for (std::size_t i = 0; i < value.size(); ++i) items.push_back(ReadItem(*type, value[i], i));
-  }
-
-  Item ReadItem(const RecordType& type, const json& value, std::size_t index) {
-    const std::string place = Indexed(type.kind, index);
-    Item item = {&file_, index, nullptr, {}};
-    const NestedKind* partKind = nullptr;
-    for (const NestedKind& nested : NestedKinds()) {
-      if (nested.owner == &type) partKind = &nested;
-    }
-    item.record = ReadRecord(type, value, place, partKind);
-    if (partKind != nullptr && value.contains(partKind->member)) {
-      const json& parts = value[std::string(partKind->member)];
-      const std::string partsPlace = place + "." + std::string(partKind->member);
-      if (!parts.is_array()) RefuseAt(file_, partsPlace, "wants an array of records");
-      for (std::size_t i = 0; i < parts.size(); ++i) {
-        item.parts.push_back(ReadRecord(*partKind->type, parts[i], Indexed(partsPlace, i), nullptr));
-      }
-    }
-    return item;
-  }
-
-  std::shared_ptr<void> ReadRecord(const RecordType& type, const json& value, const std::string& place,
-                                   const NestedKind* partKind) {
-    if (!value.is_object()) RefuseAt(file_, place, "wants an object with the record's members");
-    const bool inside = NestedIn(type) != nullptr;
-    std::shared_ptr<void> record = NewRecord(type);
-    for (const auto& given : value.items()) {
-      if (partKind != nullptr && given.key() == partKind->member) continue;
-      const Member* member = FindMember(type, given.key());
-      const std::string memberPlace = place + "." + given.key();
-      if (member == nullptr || (inside && IsGivenByOwner(*member))) RefuseAt(file_, memberPlace, "no such member");
-      Placed(memberPlace, [&] { SetMember(*member, record.get(), given.value(), workspace_); });
-    }
-    if (!inside) RequireKeys(type, value, place);
-    if (&type == &EDIDoc::kType) CheckDocument(*static_cast<const EDIDoc*>(record.get()), place);
-    return record;
-  }
-
-  static bool IsGivenByOwner(const Member& member) {
-    return member.role == MemberRole::kId || member.role == MemberRole::kOwner;
-  }
-
-  void RequireKeys(const RecordType& type, const json& value, const std::string& place) {
-    for (const Member& member : type.members) {
-      if (member.role != MemberRole::kKey && member.role != MemberRole::kOwner) continue;
-      const auto given = value.find(member.name);
-      const bool mayBeNull =
-          member.kind == MemberKind::kText || member.kind == MemberKind::kNumber || member.kind == MemberKind::kDate;
-      if (given == value.end() || (given->is_null() && !mayBeNull)) {
-        RefuseAt(file_, place + "." + std::string(member.name), "is part of the key and must be given");
-      }
-    }
-  }
-
-  // A class is bound to its document by a number of 16 bits.
-  void CheckDocument(const EDIDoc& document, const std::string& place) {
-    constexpr std::int32_t kLast = std::numeric_limits<std::int16_t>::max();
-    if (document.EDIDocId < 1 || document.EDIDocId > kLast) {
-      RefuseAt(file_, place + ".EDIDocId",
-               std::to_string(document.EDIDocId) + " is out of range (1 to " + std::to_string(kLast) + ")");
-    }
-  }
-
-  template <class F>
-  std::invoke_result_t<F> Placed(const std::string& place, F read) {
-    try {
-      return read();
-    } catch (const Refusal& refusal) {
-      RefuseAt(file_, place, refusal.what());
-    }
-  }
-
-  const std::string& file_;
-  std::string workspace_;
-  Data& data_;
-};
-
-// --- From structs to the store, in one transaction.
-
-class Storer {
+// Stores records as they are read, within a transaction of the caller's.
+class Storer : public DataTaker {
  public:
   explicit Storer(host::SqlHost& host) : host_(host), store_(host.Records()) {}
 
-  void Store(const Data& data) {
-    host_.BeginTrans();
-    try {
-      // Owners come before what they own, so that an owner of the same load is there by then.
-      for (const RecordType* type : AllRecordTypes()) {
-        const auto items = data.records.find(type);
-        if (items == data.records.end()) continue;
-        for (const Item& item : items->second) StoreItem(*type, item);
-      }
-      for (const auto& [name, text] : data.settings) host_.SetSetting(name, text);
-      host_.CommitTrans();
-    } catch (...) {
-      host_.RollbackTrans();
-      throw;
+  void TakeKind(const RecordType& type) override { loaded_.records[&type]; }
+
+  void TakeItem(const DataItem& item) override {
+    for (const Member& member : item.type->members) {
+      if (member.role == MemberRole::kOwner) NoteOwner(item, member);
+    }
+    if (!store_.ReplaceOrAdd(*item.type, item.record.get())) TellRefused(item);
+    for (const NestedKind& nested : NestedKinds()) {
+      if (nested.owner == item.type) StoreParts(nested, item);
+    }
+    ++loaded_.records[item.type];
+  }
+
+  void TakeSetting(std::string_view name, const std::string& text) override {
+    host_.SetSetting(name, text);
+    loaded_.settings.insert_or_assign(std::string(name), text);
+  }
+
+  // Once every file has been read: an owner may stand behind what it owns.
+  void RequireOwners() {
+    for (const Awaited& awaited : awaited_) {
+      if (HasOwner(*awaited.member, awaited.owner)) continue;
+      const RecordType& type = *FindRecordType(awaited.member->owner);
+      RefuseAt(*awaited.item.file, awaited.item.Place() + "." + std::string(awaited.member->name),
+               "no " + std::string(type.kind) + " with this " + std::string(IdOf(type)->name) +
+                   ", neither in the store nor in the load");
     }
   }
+
+  const Loaded& Done() const { return loaded_; }
 
  private:
-  void StoreItem(const RecordType& type, const Item& item) {
-    const std::string place = Indexed(type.kind, item.index);
-    RequireOwners(type, item, place);
-    RequireUnique(type, item, place);
-    if (!store_.ReplaceOrAdd(type, item.record.get())) Fail(item, place);
-    for (const NestedKind& nested : NestedKinds()) {
-      if (nested.owner == &type) StoreParts(nested, item, place);
-    }
+  // An owner that wasn't there when the first record that names it was.
+  struct Awaited {
+    DataItem item;  // without the record
+    const Member* member;
+    std::int64_t owner;
+  };
+
+  // Whatever stands alone names its owner by an id.
+  void NoteOwner(const DataItem& item, const Member& member) {
+    const std::int64_t owner = host::IdValue(member, item.record.get());
+    if (!owners_[member.owner].insert(owner).second || HasOwner(member, owner)) return;
+    awaited_.push_back({{item.type, item.file, item.index, nullptr, {}}, &member, owner});
   }
 
-  void StoreParts(const NestedKind& nested, const Item& item, const std::string& place) {
+  bool HasOwner(const Member& member, std::int64_t id) {
+    const RecordType& type = *FindRecordType(member.owner);
+    const std::shared_ptr<void> owner = NewRecord(type);
+    host::SetIdValue(*IdOf(type), owner.get(), id);
+    return store_.Load(type, owner.get());
+  }
+
+  void StoreParts(const NestedKind& nested, const DataItem& item) {
     const auto setOwner = [&](void* part) {
       for (const std::string_view name : nested.byOwner->members) {
         CopyMember(*FindMember(*nested.type, name), At(*FindMember(*nested.owner, name), item.record.get()), part);
@@ -199,77 +89,63 @@ class Storer {
     };
     const std::shared_ptr<void> probe = NewRecord(*nested.type);
     setOwner(probe.get());
-    if (!store_.DeleteAll(*nested.type, *nested.byOwner, probe.get())) Fail(item, place);
+    if (!store_.DeleteAll(*nested.type, *nested.byOwner, probe.get())) Fail(item);
     for (const std::shared_ptr<void>& part : item.parts) {
       setOwner(part.get());
-      if (!store_.ReplaceOrAdd(*nested.type, part.get())) Fail(item, place);
+      if (!store_.ReplaceOrAdd(*nested.type, part.get())) Fail(item);
     }
   }
 
-  void RequireOwners(const RecordType& type, const Item& item, const std::string& place) {
-    for (const Member& member : type.members) {
-      if (member.role != MemberRole::kOwner) continue;
-      const RecordType& ownerType = *FindRecordType(member.owner);
-      const Member& ownerKey = OwnKey(ownerType);
-      const std::shared_ptr<void> owner = NewRecord(ownerType);
-      CopyMember(ownerKey, At(member, item.record.get()), owner.get());
-      if (!store_.Load(ownerType, owner.get())) {
-        RefuseAt(*item.file, place + "." + std::string(member.name),
-                 "no " + std::string(ownerType.kind) + " with this " + std::string(ownerKey.name) +
-                     ", neither in the store nor in the load");
-      }
+  [[noreturn]] void TellRefused(const DataItem& item) {
+    const std::int32_t error = store_.NativeError();
+    for (const Lookup& lookup : item.type->lookups) {
+      if (lookup.unique) RequireUnique(item, lookup);
     }
+    Fail(item, error);
   }
 
-  // What other records name this one by.
-  static const Member& OwnKey(const RecordType& type) {
-    if (const Member* id = IdOf(type)) return *id;
-    for (const Member& member : type.members) {
-      if (member.role == MemberRole::kKey) return member;
-    }
-    return type.members.front();
-  }
-
-  void RequireUnique(const RecordType& type, const Item& item, const std::string& place) {
+  void RequireUnique(const DataItem& item, const Lookup& lookup) {
+    const RecordType& type = *item.type;
     const Member* id = IdOf(type);
-    for (const Lookup& lookup : type.lookups) {
-      if (!lookup.unique || id == nullptr) continue;
-      const std::shared_ptr<void> other = NewRecord(type);
-      std::string names;
-      for (const std::string_view name : lookup.members) {
-        const Member& member = *FindMember(type, name);
-        CopyMember(member, At(member, item.record.get()), other.get());
-        names += (names.empty() ? "" : ", ") + std::string(name);
-      }
-      const auto idIn = [&](const void* record) { return *static_cast<const std::int32_t*>(At(*id, record)); };
-      if (store_.Find(type, lookup, other.get()) && idIn(other.get()) != idIn(item.record.get())) {
-        RefuseAt(*item.file, place,
-                 "the " + std::string(type.kind) + " with " + std::string(id->name) + " " +
-                     std::to_string(idIn(other.get())) + " has the same " + names);
-      }
+    if (id == nullptr) return;
+    const std::shared_ptr<void> other = NewRecord(type);
+    std::string names;
+    for (const std::string_view name : lookup.members) {
+      const Member& member = *FindMember(type, name);
+      CopyMember(member, At(member, item.record.get()), other.get());
+      names += (names.empty() ? "" : ", ") + std::string(name);
     }
+    const std::int64_t own = host::IdValue(*id, item.record.get());
+    if (!store_.Find(type, lookup, other.get()) || host::IdValue(*id, other.get()) == own) return;
+    RefuseAt(*item.file, item.Place(),
+             "the " + std::string(type.kind) + " with " + std::string(id->name) + " " +
+                 std::to_string(host::IdValue(*id, other.get())) + " has the same " + names);
   }
 
-  [[noreturn]] void Fail(const Item& item, const std::string& place) {
-    throw Failure(*item.file + ": " + place + ": the database turned it away (its error " +
-                  std::to_string(store_.NativeError()) + "); nothing was stored");
+  [[noreturn]] void Fail(const DataItem& item) { Fail(item, store_.NativeError()); }
+  [[noreturn]] static void Fail(const DataItem& item, std::int32_t error) {
+    throw Failure(*item.file + ": " + item.Place() + ": the database turned it away (its error " +
+                  std::to_string(error) + "); nothing was stored");
   }
 
   host::SqlHost& host_;
   host::SqlStore& store_;
+  Loaded loaded_;
+  std::vector<Awaited> awaited_;
+  std::map<std::string_view, std::unordered_set<std::int64_t>> owners_;  // named so far, by their kind
 };
 
-void Report(const Command& command, const Data& data) {
+void Report(const Command& command, const Loaded& loaded) {
   if (command.options.json) {
     JsonWriter json(command.out);
     json.BeginObject();
     json.Name("loaded");
     json.BeginObject();
     for (const RecordType* type : AllRecordTypes()) {
-      const auto items = data.records.find(type);
-      if (items == data.records.end()) continue;
+      const auto items = loaded.records.find(type);
+      if (items == loaded.records.end()) continue;
       json.Name(type->kind);
-      json.Int(static_cast<std::int64_t>(items->second.size()));
+      json.Int(static_cast<std::int64_t>(items->second));
     }
     json.EndObject();
     json.EndObject();
@@ -278,14 +154,14 @@ void Report(const Command& command, const Data& data) {
   std::size_t total = 0;
   std::string kinds;
   for (const RecordType* type : AllRecordTypes()) {
-    const auto items = data.records.find(type);
-    if (items == data.records.end() || items->second.empty()) continue;
-    total += items->second.size();
-    kinds += (kinds.empty() ? ": " : ", ") + std::to_string(items->second.size()) + " " + std::string(type->kind);
+    const auto items = loaded.records.find(type);
+    if (items == loaded.records.end() || items->second == 0) continue;
+    total += items->second;
+    kinds += (kinds.empty() ? ": " : ", ") + std::to_string(items->second) + " " + std::string(type->kind);
   }
   PrintWrapped(command.out, "Stored " + Counted(total, "record", "records") + kinds + ".", 2, OutputWidth());
-  if (!data.settings.empty()) {
-    command.out << "Set " << Counted(data.settings.size(), "system setting", "system settings") << ".\n";
+  if (!loaded.settings.empty()) {
+    command.out << "Set " << Counted(loaded.settings.size(), "system setting", "system settings") << ".\n";
   }
 }
 
@@ -293,10 +169,18 @@ void Report(const Command& command, const Data& data) {
 
 int LoadData(const Command& command, const std::vector<std::string>& files) {
   Workspace workspace(command);
-  Data data;
-  for (const std::string& file : files) Reader(file, workspace.Folder().string(), data).Read();
-  Storer(workspace.Host()).Store(data);
-  Report(command, data);
+  host::SqlHost& host = workspace.Host();
+  Storer storer(host);
+  host.BeginTrans();
+  try {
+    for (const std::string& file : files) ReadRecords(file, workspace.Folder().string(), storer);
+    storer.RequireOwners();
+    host.CommitTrans();
+  } catch (...) {
+    host.RollbackTrans();
+    throw;
+  }
+  Report(command, storer.Done());
   return kDone;
 }
 

@@ -15,15 +15,6 @@ namespace {
 constexpr double kUnitsInACarton = 16;
 constexpr std::int32_t kCarrier = 1;
 
-// Serial shipping container code: an extension digit, the company's GS1 prefix, a serial number, and GS1's check digit
-// (weights 3 and 1 in turn).
-std::string Sscc(std::int32_t serial) {
-  std::string digits = "09312345" + Format(static_cast<double>(serial), "000000000");
-  int sum = 0;
-  for (std::size_t at = 0; at < digits.size(); ++at) sum += (digits[at] - '0') * (at % 2 == 0 ? 3 : 1);
-  return digits + static_cast<char>('0' + (10 - sum % 10) % 10);
-}
-
 class Packer {
  public:
   Packer(host::SqlHost& host, const Order& order) : host_(host), order_(order) {}
@@ -123,6 +114,13 @@ class Packer {
 };
 
 }  // namespace
+
+std::string Sscc(std::int32_t serial) {
+  std::string digits = "09312345" + Format(static_cast<double>(serial), "000000000");
+  int sum = 0;  // by weights of 3 and 1 in turn
+  for (std::size_t at = 0; at < digits.size(); ++at) sum += (digits[at] - '0') * (at % 2 == 0 ? 3 : 1);
+  return digits + static_cast<char>('0' + (10 - sum % 10) % 10);
+}
 
 PackedOrder PackNewestOrder(host::SqlHost& host, const std::string& partnerId) {
   Order newest;

@@ -20,6 +20,10 @@ struct PackedOrder {
   std::vector<PackedCarton> cartons;
 };
 
+// Serial shipping container code: an extension digit, the demo company's GS1 prefix, a serial number, and GS1's check
+// digit.
+std::string Sscc(std::int32_t serial);
+
 // Packs the newest order of the partner whole: a slip for each of its locations, cartons of a fixed size, and one
 // shipment that arrives on the first day that the order allows. Nothing is packed where there is no order.
 PackedOrder PackNewestOrder(host::SqlHost& host, const std::string& partnerId);

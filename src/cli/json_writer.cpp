@@ -12,6 +12,14 @@ namespace {
 // Deeper levels stand on one line: a record, a row.
 constexpr std::size_t kLevelsOverLines = 2;
 
+// A control character below U+0100, by the last byte of its UTF-8, which is its number.
+void AppendEscaped(std::string& json, char last) {
+  constexpr std::string_view kHex = "0123456789abcdef";
+  json += "\\u00";
+  json += kHex[static_cast<unsigned char>(last) >> 4];
+  json += kHex[static_cast<unsigned char>(last) & 15];
+}
+
 }  // namespace
 
 JsonWriter::~JsonWriter() {
@@ -85,10 +93,10 @@ void JsonWriter::String(std::string_view bytes) {
 }
 
 void JsonWriter::Quote(std::string_view bytes) {
-  constexpr std::string_view kHex = "0123456789abcdef";
   std::string quoted = "\"";
-  for (const char c : Utf8(bytes)) {
-    switch (c) {
+  const std::string text = Utf8(bytes);
+  for (std::size_t i = 0; i < text.size(); ++i) {
+    switch (const char c = text[i]) {
       case '"':
         quoted += "\\\"";
         break;
@@ -105,10 +113,9 @@ void JsonWriter::Quote(std::string_view bytes) {
         quoted += "\\t";
         break;
       default:
-        if (static_cast<unsigned char>(c) < ' ') {
-          quoted += "\\u00";
-          quoted += kHex[static_cast<unsigned char>(c) >> 4];
-          quoted += kHex[static_cast<unsigned char>(c) & 15];
+        if (const std::size_t length = ControlAt(text, i); length > 0) {
+          i += length - 1;
+          AppendEscaped(quoted, text[i]);
         } else {
           quoted += c;
         }

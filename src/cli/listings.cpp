@@ -41,18 +41,23 @@ std::string When(const Log& log) {
   return when;
 }
 
-std::string What(const Log& log) {
-  const std::string kind = ErrorNumberText(log.ErrorNumber);
-  return (kind.empty() ? "" : kind + ": ") + Shown(log.Message);
-}
-
-}  // namespace
-
-std::string ErrorNumberText(std::int32_t number) {
+// "warning", "rejection", "" for information, else the number.
+std::string KindOf(std::int32_t number) {
   if (number == kInformation) return {};
   if (number == kWarning) return "warning";
   if (number == kRejection) return "rejection";
   return "error " + std::to_string(number);
+}
+
+}  // namespace
+
+std::string LogLine(const Log& log) {
+  const std::string kind = KindOf(log.ErrorNumber);
+  std::string message = Shown(log.Message);
+  // Those of a printer begin with the number, and the next word right behind it.
+  const std::string own = "Error " + std::to_string(log.ErrorNumber);
+  if (log.ErrorNumber > 0 && message.starts_with(own)) message.erase(0, own.size());
+  return (kind.empty() ? "" : kind + ": ") + message;
 }
 
 int ListClasses(const Command& command) {
@@ -159,7 +164,7 @@ int ListLog(const Command& command, std::int32_t since) {
           case 3:
             return Shown(log.Procedure);
           default:
-            return What(log);
+            return LogLine(log);
         }
       },
       OutputWidth());

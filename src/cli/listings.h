@@ -2,7 +2,7 @@
 #pragma once
 
 #include <cstdint>
-#include <optional>
+#include <string>
 
 #include "cli/command.h"
 #include "cli/json_writer.h"
@@ -15,7 +15,8 @@ int ListDocuments(const Command& command);
 // The log records with ids above `since`.
 int ListLog(const Command& command, std::int32_t since);
 
-// "warning", "rejection", "" for information, else the number.
-std::string ErrorNumberText(std::int32_t number);
+// The record's message on one line, what kind it is before it unless it is information: "rejection: ...", "error 482:
+// ...".
+std::string LogLine(const Log& log);
 
 }  // namespace partnerkit::cli

@@ -4,7 +4,6 @@
 
 #include "cli/listings.h"
 #include "cli/record_json.h"
-#include "cli/text.h"
 #include "partnerkit/records.h"
 
 namespace partnerkit::cli {
@@ -40,8 +39,7 @@ std::vector<std::string> LogMessages(const std::vector<std::int32_t>& logIds, Re
     Log log;
     log.LogId = logId;
     if (!store.Load(Log::kType, &log)) continue;
-    const std::string kind = ErrorNumberText(log.ErrorNumber);
-    messages.push_back((kind.empty() ? "" : kind + ": ") + OneLine(Str(log.Message)));
+    messages.push_back(LogLine(log));
   }
   return messages;
 }

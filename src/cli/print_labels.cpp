@@ -14,6 +14,7 @@
 #include "cli/table.h"
 #include "cli/text.h"
 #include "cli/workspace.h"
+#include "partnerkit/catalogue.h"
 
 namespace partnerkit::cli {
 
@@ -38,16 +39,15 @@ class LabelRun {
     Ports ports = workspace_.ClassPorts();
     ports.spooler = &spooler_;
     label_ = MakeLabelClass(order.className, ports);
-    if (host_.PrinterLanguage().empty()) {
-      throw Refusal("no printer language: set PrinterLanguage in the workspace's System, or give --language");
-    }
+    CheckLanguage();
+    printer_ = Printer();
     for (const std::int32_t id : order.packs) packs_.push_back(FindPack(command, workspace_, id));
   }
 
   void PrintEach(std::int16_t quantity) {
     // Without a carton there is nothing to set a printer up for.
     const bool any = std::ranges::any_of(packs_, [](const std::optional<Pack>& pack) { return pack.has_value(); });
-    const bool ready = any && label_->Init(host_, Printer());
+    const bool ready = any && label_->Init(host_, printer_);
     for (std::size_t at = 0; at < packs_.size(); ++at) {
       const std::optional<Pack>& pack = packs_[at];
       results_.push_back({order_.packs[at], ready && pack && label_->PrintLabel(*pack, quantity)});
@@ -63,7 +63,7 @@ class LabelRun {
     }
     const bool whole = packs.size() == packs_.size();
     results_.push_back(
-        {{}, whole && label_->Init(host_, Printer()) && label_->PrintAllLabels(packs, separators, styleSort)});
+        {{}, whole && label_->Init(host_, printer_) && label_->PrintAllLabels(packs, separators, styleSort)});
   }
 
   int Finish() {
@@ -83,13 +83,21 @@ class LabelRun {
     bool printed;
   };
 
-  // A class that draws says nothing of a printer that isn't there.
-  std::string Printer() const {
-    std::string name = PrinterName();
-    const std::vector<partnerkit::Printer>& known = spooler_.Printers();
-    if (std::ranges::find(known, name, &partnerkit::Printer::Name) == known.end()) {
-      command_.Say("printer " + name + ": no such printer in " + workspace_.Folder().string());
+  void CheckLanguage() {
+    if (host_.PrinterLanguage().empty()) {
+      throw Refusal(
+          "no printer language: load the setting, such as {\"System\": {\"PrinterLanguage\": \"ZPL\"}}, or give "
+          "--language");
     }
+    const std::string known(FindClass(label_->ClassName())->format);
+    if (order_.language.empty() || (", " + known + ", ").find(", " + order_.language + ", ") != std::string::npos)
+      return;
+    throw Refusal("--language " + order_.language + ": " + order_.className + " prints " + known + " only");
+  }
+
+  std::string Printer() const {
+    const std::string name = PrinterName();
+    CheckPrinter(spooler_, name, workspace_);
     return name;
   }
 
@@ -155,6 +163,7 @@ class LabelRun {
   const LabelOrder& order_;
   Progress progress_;
   std::unique_ptr<LabelClass> label_;
+  std::string printer_;
   std::vector<std::optional<Pack>> packs_;  // as the command names them
   std::vector<Result> results_;
 };

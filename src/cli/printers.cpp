@@ -44,11 +44,7 @@ std::vector<Printer> Chosen(const spool::PrinterSpooler& spooler, const std::vec
   if (names.empty()) return spooler.Printers();
   std::vector<Printer> chosen;
   for (const std::string& name : names) {
-    const auto printer = std::ranges::find(spooler.Printers(), name, &Printer::Name);
-    if (printer == spooler.Printers().end()) {
-      throw Refusal("printer " + name + ": no such printer in " + workspace.Folder().string());
-    }
-    chosen.push_back(*printer);
+    chosen.push_back(CheckPrinter(spooler, name, workspace));
   }
   return chosen;
 }
@@ -143,6 +139,12 @@ spool::PrinterSpooler OpenSpooler(Workspace& workspace, spool::PdfDeviceFactory 
   std::vector<Printer> printers;
   host::ForEach<Printer>(workspace.Host().Records(), [&](const Printer& printer) { printers.push_back(printer); });
   return {std::move(printers), workspace.Folder(), std::move(makePdfDevice)};
+}
+
+const Printer& CheckPrinter(const spool::PrinterSpooler& spooler, const std::string& name, const Workspace& workspace) {
+  const auto printer = std::ranges::find(spooler.Printers(), name, &Printer::Name);
+  if (printer != spooler.Printers().end()) return *printer;
+  throw Refusal("printer " + name + ": no such printer in " + workspace.Folder().string());
 }
 
 int ListPrinters(const Command& command, const std::vector<std::string>& names) {

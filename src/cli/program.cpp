@@ -1,6 +1,7 @@
 #include "cli/program.h"
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <cstdint>
 #include <functional>
 #include <new>
@@ -8,17 +9,26 @@
 #include "cli/command.h"
 #include "cli/data_commands.h"
 #include "cli/demo.h"
+#include "cli/example.h"
 #include "cli/json_writer.h"
 #include "cli/listings.h"
 #include "cli/print_labels.h"
 #include "cli/printers.h"
 #include "cli/run_document.h"
+#include "cli/text.h"
 #include "cli/workspace.h"
 #include "partnerkit/version.h"
 
 namespace partnerkit::cli {
 
 namespace {
+
+constexpr std::string_view kNextSteps =
+    "  partnerkit classes                             # every document of every partner\n"
+    "  partnerkit data example clsMGB850csv --out .   # records, map and order file of one, to be filled in\n"
+    "  partnerkit data load clsMGB850csv.json\n"
+    "  partnerkit docs                                # what is defined now\n"
+    "  partnerkit process 1 inbox/orders.csv\n";
 
 int MakeNew(const Command& command, const std::string& folder) {
   const std::filesystem::path made = MakeWorkspace(folder, command.options.database);
@@ -29,9 +39,27 @@ int MakeNew(const Command& command, const std::string& folder) {
     json.String(made.string());
     json.EndObject();
   } else {
-    command.out << "Made the workspace " << made.string() << ".\n";
+    command.out << "Made the workspace " << OneLine(made.string())
+                << ". What comes next, for instance with MGB's orders:\n\n"
+                << "  cd " << OneLine(folder) << "\n"
+                << kNextSteps;
   }
   return kDone;
+}
+
+// Decimal digits and no more: CLI11 takes an empty text, which an unset variable of a shell leaves, for 0, and "010"
+// for eight.
+std::string CheckWhole(std::string& text) {
+  const std::size_t sign = text.starts_with('-') ? 1 : 0;
+  if (text.size() == sign || text.find_first_not_of("0123456789", sign) != std::string::npos)
+    return "wants a whole number, not \"" + text + "\"";
+  const std::size_t zeros = std::min(text.find_first_not_of('0', sign), text.size() - 1) - sign;
+  text.erase(sign, zeros);
+  return {};
+}
+
+CLI::Option* Whole(CLI::Option* option, const std::string& name) {
+  return option->transform(CLI::Validator(CheckWhole, ""))->type_name(name);
 }
 
 // The verbs as CLI11 knows them, and the one that the command line chose.
@@ -101,12 +129,20 @@ class Verbs {
     Add(app_, "docs", "List the document definitions of the workspace", "docs", ListDocuments);
     CLI::App* log = Add(app_, "log", "Show the run log", "log --since 120",
                         [this](const Command& command) { return ListLog(command, since_); });
-    log->add_option("--since", since_, "Only the records after the one with this id")->type_name("ID");
+    Whole(log->add_option("--since", since_, "Only the records after the one with this id"), "ID");
   }
 
   void AddDataVerbs() {
     CLI::App* data = Add(app_, "data", "Store records from JSON, or write them as JSON", "data load records.json");
     data->require_subcommand(1);
+    CLI::App* example = Add(*data, "example", "Write a first set of records for a class, to be filled in",
+                            "data example PartnerKit.clsMGB850csv --out .",
+                            [this](const Command& command) { return WriteExample(command, document_, file_); });
+    Required(example, "CLASS", document_, "The class, as `classes` lists it; its last part alone will do");
+    example
+        ->add_option("--out", file_,
+                     "Write a records file into this folder, and the map and the order file that it names")
+        ->type_name("DIR");
     CLI::App* load = Add(*data, "load", "Store the records of all files, or none of them", "data load records.json",
                          [this](const Command& command) { return LoadData(command, words_); });
     load->add_option("FILE", words_, "JSON files of records by kind")->required()->type_name("");
@@ -126,17 +162,17 @@ class Verbs {
   void AddRunVerbs() {
     AddRunVerb("rows", "Show the rows of a file and carry none out", "rows 1 inbox/orders.csv",
                [this](const Command& command) { return ShowRows(command, document_, file_); });
-    AddRunVerb("process", "Carry out rows of a file and settle it", "process 1 inbox/orders.csv --row 0 --row 2",
-               [this](const Command& command) { return ProcessRows(command, document_, file_, rows_); })
-        ->add_option("--row", rows_, "A row to carry out, counted from 0; give it again for more. All rows without it")
-        ->type_name("N")
+    CLI::App* process =
+        AddRunVerb("process", "Carry out rows of a file and settle it", "process 1 inbox/orders.csv --row 0 --row 2",
+                   [this](const Command& command) { return ProcessRows(command, document_, file_, rows_); });
+    Whole(process->add_option("--row", rows_,
+                              "A row to carry out, counted from 0; give it again for more. All rows without it"),
+          "N")
         ->allow_extra_args(false);
-    AddRunVerb("delete", "Take a row's lines out of the file without carrying it out",
-               "delete 1 inbox/orders.csv --row 3",
-               [this](const Command& command) { return DeleteRow(command, document_, file_, row_); })
-        ->add_option("--row", row_, "The row, counted from 0")
-        ->required()
-        ->type_name("N");
+    CLI::App* erase = AddRunVerb("delete", "Take a row's lines out of the file without carrying it out",
+                                 "delete 1 inbox/orders.csv --row 3",
+                                 [this](const Command& command) { return DeleteRow(command, document_, file_, row_); });
+    Whole(erase->add_option("--row", row_, "The row, counted from 0"), "N")->required();
   }
 
   CLI::App* AddLabelVerb(const std::string& name, const std::string& about, const std::string& example, Action action) {
@@ -147,7 +183,7 @@ class Verbs {
 
   CLI::App* AddPrintVerb(const std::string& name, const std::string& about, const std::string& example, Action action) {
     CLI::App* verb = AddLabelVerb(name, about, example, std::move(action));
-    verb->add_option("--pack", labels_.packs, "Ids of the packs")->required()->type_name("ID...");
+    Whole(verb->add_option("--pack", labels_.packs, "Ids of the packs"), "ID...")->required();
     verb->add_option("--printer", labels_.printer, "The printer; else the workspace's only one, else its folder spool/")
         ->type_name("P");
     verb->add_option("--language", labels_.language, "In place of the setting PrinterLanguage: LBXII, ZPL or WinPCL")
@@ -156,12 +192,12 @@ class Verbs {
   }
 
   void AddLabelVerbs() {
-    AddPrintVerb("print", "Print the labels of packs, a print job for each",
-                 "print PartnerKit.clsCMLSCM --pack 1 2 --printer warehouse",
-                 [this](const Command& command) { return PrintLabels(command, labels_, quantity_); })
-        ->add_option("--qty", quantity_, "Labels of each pack; ZPL and drawn labels are single")
-        ->check(CLI::Range(1, 32767))
-        ->type_name("N");
+    CLI::App* print = AddPrintVerb("print", "Print the labels of packs, a print job for each",
+                                   "print PartnerKit.clsCMLSCM --pack 1 2 --printer warehouse",
+                                   [this](const Command& command) { return PrintLabels(command, labels_, quantity_); });
+    Whole(print->add_option("--qty", quantity_, "Labels of each pack; ZPL and drawn labels are single")
+              ->check(CLI::Range(1, 32767)),
+          "N");
     CLI::App* all = AddPrintVerb(
         "print-all", "Print the labels of packs as one print job",
         "print-all PartnerKit.clsCMLSCM --pack 1 2 3 --separators",
@@ -172,7 +208,7 @@ class Verbs {
         AddLabelVerb("preview", "Draw a pack's label as it would leave an ordinary printer",
                      "preview PartnerKit.clsCMLSCM --pack 1 --out label.png",
                      [this](const Command& command) { return PreviewLabel(command, labels_.className, pack_, file_); });
-    preview->add_option("--pack", pack_, "Id of the pack")->required()->type_name("ID");
+    Whole(preview->add_option("--pack", pack_, "Id of the pack"), "ID")->required();
     preview->add_option("--out", file_, "The file, .png, .pdf or .svg")->required()->type_name("FILE");
   }
 

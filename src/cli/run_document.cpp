@@ -26,7 +26,7 @@ std::int16_t DocumentId(const std::string& text) {
   const char* end = text.data() + text.size();
   const auto read = std::from_chars(text.data(), end, id);
   if (read.ec != std::errc() || read.ptr != end)
-    throw Refusal("document " + text + ": not the id of a document definition");
+    throw Refusal("document " + (text.empty() ? "\"\"" : text) + ": not the id of a document definition");
   return id;
 }
 

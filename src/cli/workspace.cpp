@@ -1,6 +1,10 @@
 #include "cli/workspace.h"
 
+#include <sys/stat.h>
+
+#include <cerrno>
 #include <cstdlib>
+#include <cstring>
 #include <vector>
 
 #include "cli/table.h"
@@ -18,6 +22,9 @@ namespace {
 // spool: print jobs.
 constexpr std::string_view kFolders[] = {"maps", "inbox", "outbox", "backup", "spool"};
 
+// None for others: a supplier's prices and orders are in there.
+constexpr mode_t kFolderRights = S_IRWXU | S_IRWXG;
+
 fs::path ChosenFolder(const Options& options) {
   if (!options.workspace.empty()) return AbsolutePath(options.workspace);
   const char* named = std::getenv("PARTNERKIT_WORKSPACE");
@@ -28,6 +35,7 @@ std::unique_ptr<host::SqlHost> OpenStore(const std::string& url, bool create) {
   try {
     host::SqlOptions options;
     options.create = create;
+    options.relativePaths = true;
     return host::SqlHost::Open(url, options);
   } catch (const RunTimeError& error) {
     throw Refusal(error.Description());
@@ -52,12 +60,13 @@ class MadeFolders {
     std::error_code ignored;
     for (auto folder = made_.rbegin(); folder != made_.rend(); ++folder) fs::remove(*folder, ignored);
   }
-  void Make(const fs::path& folder) {
+  void Make(const fs::path& folder, mode_t rights = kFolderRights) {
     std::error_code failure;
     if (fs::is_directory(folder, failure)) return;
-    if (folder.has_parent_path() && folder.parent_path() != folder) Make(folder.parent_path());
-    fs::create_directory(folder, failure);
-    if (failure) throw Refusal(folder.string() + ": cannot be made: " + failure.message());
+    if (folder.has_parent_path() && folder.parent_path() != folder) Make(folder.parent_path(), ACCESSPERMS);
+    if (::mkdir(folder.c_str(), rights) != 0) {
+      throw Refusal(folder.string() + ": cannot be made: " + std::strerror(errno));
+    }
     made_.push_back(folder);
   }
   void Keep() { made_.clear(); }

@@ -293,7 +293,7 @@ std::optional<std::string> SqlHost::Setting(std::string_view name) {
                                        {MemberKind::kString}, {MemberKind::kString});
     find.Parameter(0).Set(name);
     std::optional<std::string> value;
-    if (find.Execute()) value = find.Column(0).text;
+    if (find.Execute()) value = find.Column(0).Given();
     find.Reset();
     return parts_->settings.emplace(name, std::move(value)).first->second;
   });
@@ -305,7 +305,7 @@ std::vector<std::pair<std::string, std::string>> SqlHost::Settings() {
     Statement& all = parts_->Prepared("SELECT \"Name\",\"Value\" FROM " + Quoted(kSettingsTable) + " ORDER BY \"Name\"",
                                       {}, {MemberKind::kString, MemberKind::kString});
     for (bool more = all.Execute(); more; more = all.Next())
-      settings.emplace_back(all.Column(0).text, all.Column(1).text);
+      settings.emplace_back(all.Column(0).Given(), all.Column(1).Given());
     return settings;
   });
 }

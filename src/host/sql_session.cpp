@@ -1,5 +1,8 @@
 #include "host/sql_session.h"
 
+#include <fcntl.h>
+#include <unistd.h>
+
 #include <filesystem>
 #include <system_error>
 #include <thread>
@@ -14,6 +17,8 @@ using std::chrono::steady_clock;
 constexpr std::chrono::microseconds kPoll{500};
 constexpr std::chrono::milliseconds kTurn{1};
 constexpr std::chrono::milliseconds kTurnEvery{100};
+
+constexpr std::string_view kInMemory = ":memory:";
 
 constexpr Dialect kSqlite = {
     .idColumn = "INTEGER PRIMARY KEY",
@@ -42,13 +47,29 @@ std::string FileOf(std::string_view url) {
   Refuse(url, "unknown kind of database");
 }
 
+// An empty file, which SQLite takes for a new database. It gives the files beside it the same rights: others have none,
+// for prices stand in them. What fails here fails in SQLite again.
+void MakePrivate(const std::string& file) {
+  const int made = ::open(file.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, S_IRUSR | S_IWUSR | S_IRGRP | S_IWGRP);
+  if (made >= 0) ::close(made);
+}
+
 void CheckFile(const std::string& file, bool create) {
   if (file.empty()) Refuse("database", "no file is named");
-  if (file == ":memory:") return;
+  if (file == kInMemory) return;
   std::error_code error;
   const auto status = std::filesystem::status(file, error);
   if (std::filesystem::is_directory(status)) Refuse(file, "is a folder, not a database");
-  if (!create && status.type() == std::filesystem::file_type::not_found) Refuse(file, "there is no such database");
+  const bool there = status.type() != std::filesystem::file_type::not_found;
+  if (!create && !there) Refuse(file, "there is no such database");
+  if (!create && std::filesystem::file_size(file, error) == 0) {
+    Refuse(file, "is empty, and was a database: bring it back from a backup, or remove it and make a new one");
+  }
+  if (create && !there) MakePrivate(file);
+}
+
+std::string FolderOf(const std::string& file) {
+  return std::filesystem::absolute(file).lexically_normal().parent_path().string();
 }
 
 // SOCI's connection text is a list of name=value; a path with a "=" has to be quoted, and only then may it not hold a
@@ -74,6 +95,7 @@ std::string Quoted(std::string_view identifier) {
 SqlSession::SqlSession(std::string_view url, const SqlOptions& options)
     : name_(FileOf(url)), options_(options), dialect_(&kSqlite), lastTurn_(steady_clock::now()) {
   CheckFile(name_, options.create);
+  if (options.relativePaths && name_ != kInMemory) paths_ = KeptPaths(FolderOf(name_));
   try {
     soci_.open(soci::sqlite3, ConnectionText(name_));
   } catch (const soci::soci_error&) {

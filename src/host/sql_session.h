@@ -7,6 +7,7 @@
 #include <string>
 #include <string_view>
 
+#include "host/kept_paths.h"
 #include "host/soci.h"
 #include "host/sql_options.h"
 
@@ -63,6 +64,7 @@ class SqlSession {
   const Dialect& Sql() const { return *dialect_; }
   // The database as messages name it.
   const std::string& Name() const { return name_; }
+  const KeptPaths& Paths() const { return paths_; }
 
   // One statement without parameters or result.
   void Execute(const std::string& sql);
@@ -151,6 +153,7 @@ class SqlSession {
 
   std::string name_;
   SqlOptions options_;
+  KeptPaths paths_;
   const Dialect* dialect_;
   soci::session soci_;
   std::unique_ptr<soci::statement> begin_, commit_, rollback_;

@@ -6,9 +6,12 @@
 namespace partnerkit::host {
 namespace {
 
-std::vector<Cell> CellsFor(std::span<const MemberKind> kinds) {
+std::vector<Cell> CellsFor(std::span<const MemberKind> kinds, const KeptPaths& paths) {
   std::vector<Cell> cells(kinds.size());
-  for (std::size_t n = 0; n < kinds.size(); ++n) cells[n].kind = kinds[n];
+  for (std::size_t n = 0; n < kinds.size(); ++n) {
+    cells[n].kind = kinds[n];
+    cells[n].paths = &paths;
+  }
   return cells;
 }
 
@@ -42,7 +45,14 @@ T& As(void* value) {
 
 void Cell::Set(std::string_view value) {
   text.assign(value);
+  paths->Keep(text);
   state = soci::i_ok;
+}
+
+std::string Cell::Given() const {
+  std::string given = text;
+  paths->GiveBack(given);
+  return given;
 }
 
 void Cell::Set(std::int64_t value) {
@@ -55,9 +65,13 @@ void Cell::CopyFrom(const void* value) {
   switch (kind) {
     case MemberKind::kString:
       text = As<std::string>(value);
+      paths->Keep(text);
       break;
     case MemberKind::kText:
-      if ((present = As<Text>(value).has_value())) text = *As<Text>(value);
+      if ((present = As<Text>(value).has_value())) {
+        text = *As<Text>(value);
+        paths->Keep(text);
+      }
       break;
     case MemberKind::kInt:
       whole = As<std::int32_t>(value);
@@ -86,9 +100,11 @@ void Cell::CopyTo(void* value) const {
   switch (kind) {
     case MemberKind::kString:
       As<std::string>(value).assign(null ? std::string_view() : std::string_view(text));
+      paths->GiveBack(As<std::string>(value));
       break;
     case MemberKind::kText:
       As<Text>(value) = null ? Text() : Text(text);
+      if (!null) paths->GiveBack(*As<Text>(value));
       break;
     case MemberKind::kInt:
       As<std::int32_t>(value) = null ? 0 : static_cast<std::int32_t>(whole);
@@ -113,7 +129,9 @@ void Cell::CopyTo(void* value) const {
 
 Statement::Statement(SqlSession& session, const std::string& sql, std::span<const MemberKind> parameters,
                      std::span<const MemberKind> columns)
-    : parameters_(CellsFor(parameters)), columns_(CellsFor(columns)), statement_(session.Soci()) {
+    : parameters_(CellsFor(parameters, session.Paths())),
+      columns_(CellsFor(columns, session.Paths())),
+      statement_(session.Soci()) {
   statement_.alloc();
   for (Cell& cell : columns_) {
     WithValue(cell, [&](auto& value) { statement_.exchange(soci::into(value, cell.state)); });

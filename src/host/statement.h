@@ -18,10 +18,13 @@ struct Cell {
   soci::indicator state = soci::i_ok;
   long long whole = 0;  // kInt, kLong, kBool
   double real = 0;      // kDouble, kNumber
-  std::string text;     // kString, kText, kDate
+  std::string text;     // kString, kText, kDate; as the store keeps it
+  const KeptPaths* paths = nullptr;
 
   void Set(std::string_view value);
   void Set(std::int64_t value);
+  // As it was given.
+  std::string Given() const;
   bool IsNull() const { return state == soci::i_null; }
   // Copies from and to a member's own memory, which is of the cell's kind. A null read into a member that has no null
   // gives its zero.

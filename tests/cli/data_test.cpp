@@ -1,4 +1,5 @@
 #include <gmock/gmock.h>
+#include <sys/resource.h>
 
 #include "cli/supplier.h"
 
@@ -97,6 +98,16 @@ TEST_F(Data, ReplacesByKeyAsAWhole) {
   EXPECT_EQ(all["System"], nlohmann::json::parse(R"({"CompanyName": "Acme Apparel", "ComPort": "LPT1"})"));
 }
 
+TEST_F(Data, NeverTakesAPartnersNumbersBack) {
+  Put(R"({"Partner": [{"PartnerId": "P1", "LastASNNo": 7, "LastInterchangeNo": 8, "LastGroupNo": 9}]})");
+  Put(R"({"Partner": [{"PartnerId": "P1", "City": "Geelong", "LastInterchangeNo": 5, "LastGroupNo": 12}]})");
+  const auto stored = Json({"data", "dump", "Partner"})["Partner"][1];
+  EXPECT_EQ(stored["City"], "Geelong");
+  EXPECT_EQ(stored["LastASNNo"], 7);
+  EXPECT_EQ(stored["LastInterchangeNo"], 8);
+  EXPECT_EQ(stored["LastGroupNo"], 12);
+}
+
 TEST_F(Data, FindsTheOwnerInTheStoreOrInAnyFileOfTheLoad) {
   folder.Write("lines.json", R"({"OrderLine": [{"OrderId": 30, "ProductNo": "A"}]})");
   folder.Write("order.json", R"({"Order": [{"OrderId": 30, "PONo": "N30"}]})");
@@ -104,6 +115,30 @@ TEST_F(Data, FindsTheOwnerInTheStoreOrInAnyFileOfTheLoad) {
             nlohmann::json::parse(R"({"Order": 1, "OrderLine": 1})"));
   EXPECT_EQ(Run({"data", "load", "lines.json"}).out, "Stored 1 record: 1 OrderLine.\n");
   EXPECT_EQ(Json({"data", "dump", "OrderLine"})["OrderLine"].size(), 2U);
+}
+
+TEST_F(Data, TakesARecordOfManyNoLongerThanOneOfFew) {
+  // Processor seconds of a load of so many packs with a line each.
+  const auto load = [&](int count) {
+    std::string packs = R"({"PackLine": [{"PackId": 1})", lines = R"(], "Pack": [{"Id": 1})";
+    for (int n = 2; n <= count; ++n) {
+      packs += ", {\"PackId\": " + std::to_string(n) + "}";
+      lines += ", {\"Id\": " + std::to_string(n) + "}";
+    }
+    const auto busy = [] {
+      rusage usage{};
+      getrusage(RUSAGE_CHILDREN, &usage);
+      const auto seconds = [](const timeval& time) {
+        return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) / 1e6;
+      };
+      return seconds(usage.ru_utime) + seconds(usage.ru_stime);
+    };
+    const double before = busy();
+    Put(packs + lines + "]}");
+    return busy() - before;
+  };
+  const double few = load(5'000);
+  EXPECT_LT(load(80'000), 16 * few * 2);
 }
 
 TEST_F(Data, PutsTheWorkspaceIntoTexts) {

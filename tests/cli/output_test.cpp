@@ -26,6 +26,8 @@ TEST(Text, IsUtf8OrElseWindows1252) {
 
 TEST(Text, StandsOnOneHarmlessLine) {
   EXPECT_EQ(OneLine(" found. \r\n Add\tthis\x1b[2J\x7f \xC2\x9B 1\n"), "found. Add this?[2J? ? 1");
+  EXPECT_EQ(OneLine("1\u061c2\u200e3\u200f4\u202a5\u202e6\u20667\u2069"), "1?2?3?4?5?6?7?");
+  EXPECT_EQ(OneLine("\u061b\u200d\u2010\u2029\u202f\u2065\u206a"), "\u061b\u200d\u2010\u2029\u202f\u2065\u206a");
   EXPECT_EQ(Width("\u20ac\u00e9-1"), 4U);
 }
 
@@ -42,7 +44,7 @@ TEST(Json, PutsEachRowOnALineAndClosesWhatIsOpen) {
     for (const double row : {1.0, 0.1 + 0.2}) {
       json.BeginArray();
       json.Value(Cell(row));
-      json.Value(Cell("q\"\\\n\x02"));
+      json.Value(Cell("q\"\\\n\x02\x7f\u0080\u009f\u00a0"));
       json.Value(Cell(*DateTime::FromYmd(2004, 7, 31)));
       json.Value(Cell());
       json.Number(std::numeric_limits<double>::infinity());
@@ -51,15 +53,16 @@ TEST(Json, PutsEachRowOnALineAndClosesWhatIsOpen) {
     json.BeginObject();
     json.Name("cut short");
   }
-  EXPECT_EQ(out.str(),
-            "{\n"
-            "  \"none\": [],\n"
-            "  \"rows\": [\n"
-            "    [1, \"q\\\"\\\\\\n\\u0002\", \"2004-07-31\", null, null],\n"
-            "    [0.30000000000000004, \"q\\\"\\\\\\n\\u0002\", \"2004-07-31\", null, null],\n"
-            "    {\"cut short\": null}\n"
-            "  ]\n"
-            "}\n");
+  EXPECT_EQ(
+      out.str(),
+      "{\n"
+      "  \"none\": [],\n"
+      "  \"rows\": [\n"
+      "    [1, \"q\\\"\\\\\\n\\u0002\\u007f\\u0080\\u009f\u00a0\", \"2004-07-31\", null, null],\n"
+      "    [0.30000000000000004, \"q\\\"\\\\\\n\\u0002\\u007f\\u0080\\u009f\u00a0\", \"2004-07-31\", null, null],\n"
+      "    {\"cut short\": null}\n"
+      "  ]\n"
+      "}\n");
 }
 
 TEST(Table, BreaksTheLastColumnBetweenWords) {

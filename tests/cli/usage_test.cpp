@@ -1,4 +1,7 @@
 #include <gmock/gmock.h>
+#include <sys/stat.h>
+
+#include <iterator>
 
 #include "cli/supplier.h"
 
@@ -23,6 +26,16 @@ TEST_F(Usage, RefusesWhatCannotRun) {
       {{"process", "2", "inbox/orders.csv"}, "document 2: class \"PartnerKit.clsNobody850csv\" is not known"},
       {{"process", "1", "inbox/orders.csv", "--row", "0", "--row", "-1"}, "--row -1: inbox/orders.csv has rows 0 to 3"},
       {{"delete", "1", "inbox/orders.csv", "--row", "4"}, "--row 4: inbox/orders.csv has rows 0 to 3"},
+      {{"rows", "", "inbox/orders.csv"}, "document \"\": not the id of a document definition"},
+      {{"process", "1", "inbox/orders.csv", "--row", ""}, "--row: wants a whole number, not \"\""},
+      {{"process", "1", "inbox/orders.csv", "--row", "0", "--row", "0x1"}, "--row: wants a whole number, not \"0x1\""},
+      {{"process", "1", "inbox/orders.csv", "--row", "012"}, "--row 12: inbox/orders.csv has rows 0 to 3"},
+      {{"delete", "1", "inbox/orders.csv", "--row", ""}, "--row: wants a whole number, not \"\""},
+      {{"log", "--since", ""}, "--since: wants a whole number, not \"\""},
+      {{"print", "clsCMLSCM", "--pack", "1", ""}, "--pack: wants a whole number, not \"\""},
+      {{"print", "clsCMLSCM", "--pack", "1", "--qty", ""}, "--qty: wants a whole number, not \"\""},
+      {{"print", "clsCMLSCM", "--pack", "99999999999"}, "--pack"},
+      {{"preview", "clsCMLSCM", "--pack", "1 ", "--out", "x.png"}, "--pack: wants a whole number, not \"1 \""},
       {{"--now", "yesterday", "docs"}, "--now yesterday: wants a time such as 2006-03-08T10:15:00"},
       {{"--workspace", "elsewhere", "docs"}, "elsewhere: no such workspace folder"},
       {{"--workspace", "maps", "docs"}, "maps: not a workspace, it holds no partnerkit.db"},
@@ -47,6 +60,14 @@ TEST_F(Usage, RefusesADatabaseThatIsNone) {
   folder.Write("partnerkit.db", std::string(4096, 'x'));
   ExpectRefused({"docs"}, "partnerkit.db: file is not a database");
   EXPECT_EQ(folder.Read("partnerkit.db"), std::string(4096, 'x'));
+  folder.Write("partnerkit.db", "");
+  for (const char* command : {"docs", "data dump", "process 1 inbox/orders.csv", "print clsCMLSCM --pack 1", "log"}) {
+    std::istringstream words{std::string(command)};
+    ExpectRefused({std::istream_iterator<std::string>(words), {}},
+                  "partnerkit.db: is empty, and was a database: bring it back from a backup, or remove it");
+  }
+  ExpectRefused({"new", "."}, "is a workspace already");
+  EXPECT_EQ(folder.Read("partnerkit.db"), "");
 }
 
 TEST_F(Usage, FindsTheWorkspaceByOptionThenEnvironmentThenFolder) {
@@ -68,6 +89,20 @@ TEST_F(Usage, LeavesNothingWhereAWorkspaceCannotBeMade) {
   const Ran ran = Run({"--database", "postgresql://nowhere/db", "new", "a/b"});
   EXPECT_EQ(ran.status, 2);
   EXPECT_FALSE(folder.Has("a"));
+}
+
+TEST_F(Usage, AWorkspaceIsNoneOfOthersBusiness) {
+  const mode_t before = umask(0022);
+  EXPECT_EQ(Run({"new", "our/mine"}).status, 0);
+  EXPECT_EQ(Run({"--database", "our/mine/more.db", "docs"}).status, 0);
+  umask(before);
+  const std::pair<const char*, int> table[] = {{"our", 0755},
+                                               {"our/mine", 0750},
+                                               {"our/mine/spool", 0750},
+                                               {"our/mine/partnerkit.db", 0640},
+                                               {"our/mine/more.db", 0640}};
+  for (const auto& [name, rights] : table)
+    EXPECT_EQ(static_cast<int>(std::filesystem::status(folder / name).permissions()), rights) << name;
 }
 
 TEST_F(Usage, EveryVerbHasAnExample) {

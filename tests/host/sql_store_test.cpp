@@ -105,5 +105,39 @@ TEST_F(SqlStoreTest, PreparesEachStatementOnce) {
   EXPECT_EQ(session_.Prepared(), prepared);
 }
 
+TEST_F(SqlStoreTest, KeepsPathsBelowItsFolderRelativeToIt) {
+  const std::string folder = std::filesystem::path(Path()).parent_path();
+  std::filesystem::create_directory_symlink(folder, folder + "-link");
+  const std::pair<std::string, std::string> table[] = {
+      {folder, "${workspace}"},
+      {folder + "/maps/", "${workspace}/maps/"},
+      {folder + "er/maps/", folder + "er/maps/"},
+      {"x" + folder + "/maps/", "x" + folder + "/maps/"},
+      {"${workspace}/maps/", "$${workspace}/maps/"},
+      {"$$${workspace}", "$$$${workspace}"},
+      {"${workspace", "${workspace"},
+      {"$", "$"},
+  };
+  SqlSession session(folder + "/../" + std::filesystem::path(folder).filename().string() + "/store.db",
+                     {.relativePaths = true});
+  SqlStore store(session);
+  for (const auto& [given, kept] : table) {
+    Sample sample{.Code = given, .Note = given};
+    ASSERT_TRUE(Add(store, sample));
+    session.Commit();
+    EXPECT_EQ(Ask(Path(), "SELECT Code||' '||Note FROM tbSample ORDER BY SampleId DESC LIMIT 1"), kept + " " + kept);
+    Sample found{.Code = given};
+    ASSERT_TRUE(Find(store, Sample::kByCode, found));
+    EXPECT_EQ(found.Code + " " + found.Note.value_or(""), given + " " + given);
+  }
+  // By a link the same paths are found, and given back below it.
+  SqlSession linked(folder + "-link/store.db", {.relativePaths = true});
+  SqlStore linkedStore(linked);
+  Sample found{.Code = folder + "/maps/"};
+  ASSERT_TRUE(Find(linkedStore, Sample::kByCode, found));
+  EXPECT_EQ(found.Note, folder + "-link/maps/");
+  std::filesystem::remove(folder + "-link");
+}
+
 }  // namespace
 }  // namespace partnerkit::host
