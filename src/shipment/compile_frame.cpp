@@ -68,6 +68,8 @@ std::int32_t CompileFrame::Load(const std::string& a_sFileName, RowTable& a_vtRo
     waiting_.clear();
     TakeUpInterrupted(Document().VendorId, Document().PartnerId,
                       [&](std::string_view told) { WriteLog(kWarning, "Load", told); });
+    if (output_.find('*') == std::string::npos) ClearDrafts(output_);
+    if (inventoryOn_) ClearDrafts(inventoryPath_);
     WarnOfCircles();
     Host().PackListMode = 0;
     const PackPointers packs = Try([&] { return Host().PacksToCompile(Document().VendorId, Document().PartnerId); });
@@ -164,6 +166,20 @@ void CompileFrame::TakeUpInterrupted(const PendingNotice& ofFile, const Tell& te
   for (const auto& notice : pending) TakeUpInterrupted(notice->VendorId, notice->PartnerId, tell);
 }
 
+// One that means the same to a run in another folder, and once the user's link leads elsewhere.
+std::string CompileFrame::NotedName(const std::string& path, Naming naming) {
+  return FileSystem().FullName(naming == Naming::kGiven ? FileSystem().Resolved(path) : path);
+}
+
+// Of runs that were killed before they noted anything. The number in a name that we make up comes again, and the next
+// draft of that name clears the one that was left; but a file that somebody else made meanwhile has no draft again.
+void CompileFrame::ClearDrafts(const std::string& path) {
+  PendingNotice noted;
+  noted.FileName = NotedName(path, Naming::kGiven);
+  const bool none = Try([&] { return Count(Records(), PendingNotice::kByFileName, noted) == 0; });
+  if (none && !path.empty()) NoticeFiles::ClearDrafts(FileSystem(), noted.FileName);
+}
+
 // The draft goes once nothing is noted of the file that it was to be: without it that one would seem to have had its
 // name.
 void CompileFrame::TakeBack(const PendingNotice& file, const PendingNotice* draft, const Tell& tell) {
@@ -252,8 +268,7 @@ bool CompileFrame::NotePending(Notice& notice) {
 // The file's number among the notice's files; nothing, with the cause in ErrorNumber, when it can't be opened.
 std::optional<std::size_t> CompileFrame::OpenFile(Notice& notice, const std::string& path, Naming naming) {
   PendingNotice interrupted;
-  // A name that means the same to a run in another folder, and once the user's link leads elsewhere.
-  interrupted.FileName = FileSystem().FullName(naming == Naming::kGiven ? FileSystem().Resolved(path) : path);
+  interrupted.FileName = NotedName(path, naming);
   const auto isWhole = [&] {
     return Try([&] { return Count(Records(), PendingNotice::kByFileName, interrupted) == 0; });
   };

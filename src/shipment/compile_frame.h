@@ -95,6 +95,8 @@ class CompileFrame : public TranslatorBase {
   RowKey KeyOf(const Pack& pack) const;
   ASN AsnOf(const Pack& pack);
   void ListPacks(const PackPointers& packs, RowTable& rows);
+  std::string NotedName(const std::string& path, Naming naming);
+  void ClearDrafts(const std::string& path);
   void TakeUpInterrupted(std::string_view vendorId, std::string_view partnerId, const Tell& tell);
   void TakeUpInterrupted(const PendingNotice& ofFile, const Tell& tell);
   void TakeBack(const PendingNotice& file, const PendingNotice* draft, const Tell& tell);

@@ -210,4 +210,13 @@ bool NoticeFiles::RemoveDraft(Files& files, const std::string& draft) {
   return true;
 }
 
+// A new draft clears them away. One that can't be made is missed by nobody.
+void NoticeFiles::ClearDrafts(Files& files, const std::string& path) {
+  Done([&] {
+    std::string draft;
+    const auto file = files.OpenDraft(path, draft);
+    files.Delete(draft);
+  });
+}
+
 }  // namespace partnerkit::shipment

@@ -76,6 +76,8 @@ class NoticeFiles {
   static TakenBack TakeBack(Files& files, const FileGrowth& growth);
   // False while another program has it.
   static bool RemoveDraft(Files& files, const std::string& draft);
+  // Those of a file that killed programs left. Nothing may be noted of any.
+  static void ClearDrafts(Files& files, const std::string& path);
 
  private:
   struct Held {

@@ -184,6 +184,19 @@ TEST(NoticeFilesTest, LeaveNoDraftBehindARunKilledAtOnce) {
   trade.folder.Write("out/.stock.partnerkit-1", "");
   EXPECT_EQ(trade.Run("out/asn*.csv").front().result, 1);
   EXPECT_EQ(trade.Files(), "asn.csv asn1001.csv stock");
+  // And another program made the files then.
+  trade.folder.Write(kDraftOfOutput, "");
+  trade.folder.Write("out/.stock.partnerkit-1", "");
+  trade.folder.Write("out/.stock.partnerkit-2", "");
+  trade.Loaded();
+  EXPECT_EQ(trade.Files(), "asn.csv asn1001.csv stock");
+}
+
+TEST(NoticeFilesTest, KeepTheDraftsThatAnotherPartnersNoticeIsNotedWith) {
+  KilledTrade trade(kMade, "-", "TOYS");
+  trade.folder.Write(kDraftOfOutput, kNotice);
+  trade.Loaded();
+  EXPECT_TRUE(trade.folder.Has(kDraftOfOutput));
 }
 
 // Another partner's notice, of a document that writes to the same file.
