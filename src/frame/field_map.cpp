@@ -4,6 +4,7 @@
 
 #include "frame/delimited.h"
 #include "frame/line_reader.h"
+#include "frame/outbound_value.h"
 
 namespace partnerkit {
 
@@ -48,7 +49,7 @@ bool FindColumn(const MapHeader& header, MapField& field) {
 }
 
 void AppendColumn(const MapField* field, std::string& line) {
-  if (field != nullptr) line += TrimBlanks(field->FieldValue);
+  if (field != nullptr) AppendTrimmedValue(field->FieldValue, line);
   line += ',';
 }
 

@@ -171,7 +171,12 @@ Draft MakeDraft(const std::string& native) {
   const std::size_t begin = slash == std::string::npos ? 0 : slash + 1;
   const std::string stem = native.substr(0, begin) + "." + native.substr(begin, kLongestPart) + ".partnerkit-";
   for (int number = 1; number <= kMostDrafts; ++number) {
-    if (auto draft = MakeDraftNamed(stem + std::to_string(number), native)) return *std::move(draft);
+    auto draft = MakeDraftNamed(stem + std::to_string(number), native);
+    if (!draft) continue;
+    // Several programs at once may have left several.
+    struct stat left {};
+    while (lstat((stem + std::to_string(++number)).c_str(), &left) == 0) ClearDraft(stem + std::to_string(number));
+    return *std::move(draft);
   }
   Raise(run_time::kPermissionDenied, native, "Every name for a draft of the file is in use");
 }

@@ -4,6 +4,7 @@
 
 #include "frame/file_name.h"
 #include "frame/format.h"
+#include "shipment/lead_circles.h"
 
 namespace partnerkit::shipment {
 
@@ -13,6 +14,18 @@ namespace {
 constexpr std::int32_t kCompiled = 8;
 // The partner's option that switches the inventory file on, and no component.
 constexpr std::string_view kInventoryOption = "TL2Compatible";
+
+// Records that are all wrong in the same way would fill the log at every listing.
+constexpr std::size_t kMostCirclesTold = 10;
+// The length before it that tells a draft's record from others.
+constexpr std::int64_t kDraft = -1;
+
+bool IsDraft(const PendingNotice& notice) { return notice.LengthBefore == kDraft; }
+
+// The record of a draft stands behind that of its file.
+bool IsDraftOf(const PendingNotice& draft, const PendingNotice& file) {
+  return IsDraft(draft) && file.NewFile && !IsDraft(file) && draft.ASNNo == file.ASNNo;
+}
 
 ColumnTable Columns() {
   return {{"ConNote No", 0, 1500},
@@ -50,15 +63,14 @@ std::int32_t CompileFrame::Load(const std::string& a_sFileName, RowTable& a_vtRo
     inventoryPath_ = Str(TradingPartner().InventoryFile);
     inventoryOn_ = inventoryPath_.size() > 1 && extension == kInventoryOption;
     output_ = a_sFileName;
+    ends_.clear();
     rows_.clear();
     waiting_.clear();
-    PendingNotice interrupted;
-    interrupted.VendorId = Document().VendorId;
-    interrupted.PartnerId = Document().PartnerId;
-    TakeUpInterrupted(PendingNotice::kByVendorAndPartner, interrupted,
+    TakeUpInterrupted(Document().VendorId, Document().PartnerId,
                       [&](std::string_view told) { WriteLog(kWarning, "Load", told); });
-    Try([&] { NoticeFiles::RemoveUnwritten(FileSystem(), output_); });
-    if (inventoryOn_) Try([&] { NoticeFiles::RemoveUnwritten(FileSystem(), inventoryPath_); });
+    if (output_.find('*') == std::string::npos) ClearDrafts(output_);
+    if (inventoryOn_) ClearDrafts(inventoryPath_);
+    WarnOfCircles();
     Host().PackListMode = 0;
     const PackPointers packs = Try([&] { return Host().PacksToCompile(Document().VendorId, Document().PartnerId); });
     if (packs.empty()) {
@@ -68,6 +80,18 @@ std::int32_t CompileFrame::Load(const std::string& a_sFileName, RowTable& a_vtRo
     ListPacks(packs, a_vtRows);
     rows = static_cast<std::int32_t>(rows_.size());
   });
+}
+
+// No host hands these out, and none is asked for more than its records.
+void CompileFrame::WarnOfCircles() {
+  const auto circles =
+      Try([&] { return LeadCircles(Records(), Document().VendorId, Document().PartnerId, kCompiled); });
+  for (std::size_t n = 0; n < circles.size() && n < kMostCirclesTold; ++n) {
+    WriteLog(kWarning, "Load", Told(circles[n]));
+  }
+  if (circles.size() <= kMostCirclesTold) return;
+  WriteLog(kWarning, "Load",
+           "So do packs in " + std::to_string(circles.size() - kMostCirclesTold) + " more circles of leads");
 }
 
 CompileFrame::RowKey CompileFrame::KeyOf(const Pack& pack) const {
@@ -124,28 +148,62 @@ ASN CompileFrame::AsnOf(const Pack& pack) {
 
 // What a killed run left: a notice that is written, in full or in part, and not stored, so that its packs still wait.
 // While a file can't be cut back the record of it stays.
-void CompileFrame::TakeUpInterrupted(const Lookup& lookup, const PendingNotice& probe, const Tell& tell) {
-  const auto pending = Try([&] { return Select(Records(), lookup, probe); });
-  for (const auto& notice : pending) Try([&] { TakeBack(*notice, tell); });
-}
-
-void CompileFrame::TakeBack(const PendingNotice& notice, const Tell& tell) {
-  const FileGrowth growth = {notice.FileName, notice.NewFile, static_cast<std::uint64_t>(notice.LengthBefore),
-                             static_cast<std::uint64_t>(notice.LengthAdded)};
-  const auto done = NoticeFiles::TakeBack(FileSystem(), growth);
-  if (done == NoticeFiles::TakenBack::kInUse) return;
-  Forget(notice);
-  const std::string what = "Notice " + notice.ASNNo + " of an interrupted run was never stored";
-  if (done == NoticeFiles::TakenBack::kCutBack) tell(what + " and is taken out of " + notice.FileName);
-  if (done == NoticeFiles::TakenBack::kChanged) {
-    tell(what + ", and " + notice.FileName + " has changed since: look whether the partner got that notice");
+void CompileFrame::TakeUpInterrupted(std::string_view vendorId, std::string_view partnerId, const Tell& tell) {
+  PendingNotice probe;
+  probe.VendorId = vendorId;
+  probe.PartnerId = partnerId;
+  const auto pending = Try([&] { return Select(Records(), PendingNotice::kByVendorAndPartner, probe); });
+  for (std::size_t n = 0; n < pending.size(); ++n) {
+    const bool drafted = n + 1 < pending.size() && IsDraftOf(*pending[n + 1], *pending[n]);
+    Try([&] { TakeBack(*pending[n], drafted ? pending[n + 1].get() : nullptr, tell); });
+    if (drafted) ++n;
   }
 }
 
-// Another program may have been quicker.
-void CompileFrame::Forget(const PendingNotice& notice) {
-  if (!partnerkit::Delete(Records(), notice) && Records().NativeError() != 0)
-    RaiseStore(*this, "A notice stays pending");
+// Of every partner whose notice went to that file.
+void CompileFrame::TakeUpInterrupted(const PendingNotice& ofFile, const Tell& tell) {
+  const auto pending = Try([&] { return Select(Records(), PendingNotice::kByFileName, ofFile); });
+  for (const auto& notice : pending) TakeUpInterrupted(notice->VendorId, notice->PartnerId, tell);
+}
+
+// One that means the same to a run in another folder, and once the user's link leads elsewhere.
+std::string CompileFrame::NotedName(const std::string& path, Naming naming) {
+  return FileSystem().FullName(naming == Naming::kGiven ? FileSystem().Resolved(path) : path);
+}
+
+// Of runs that were killed before they noted anything. The number in a name that we make up comes again, and the next
+// draft of that name clears the one that was left; but a file that somebody else made meanwhile has no draft again.
+void CompileFrame::ClearDrafts(const std::string& path) {
+  PendingNotice noted;
+  noted.FileName = NotedName(path, Naming::kGiven);
+  const bool none = Try([&] { return Count(Records(), PendingNotice::kByFileName, noted) == 0; });
+  if (none && !path.empty()) NoticeFiles::ClearDrafts(FileSystem(), noted.FileName);
+}
+
+// The draft goes once nothing is noted of the file that it was to be: without it that one would seem to have had its
+// name.
+void CompileFrame::TakeBack(const PendingNotice& file, const PendingNotice* draft, const Tell& tell) {
+  const auto removeDraft = [&](const PendingNotice& of) {
+    if (NoticeFiles::RemoveDraft(FileSystem(), of.FileName)) Forget(of);
+  };
+  if (IsDraft(file)) return removeDraft(file);
+  const auto done = NoticeFiles::TakeBack(
+      FileSystem(), {file.FileName, draft != nullptr ? draft->FileName : "", file.NewFile,
+                     static_cast<std::uint64_t>(file.LengthBefore), static_cast<std::uint64_t>(file.LengthAdded)});
+  if (done == NoticeFiles::TakenBack::kInUse || !Forget(file)) return;
+  if (draft != nullptr) removeDraft(*draft);
+  const std::string what = "Notice " + file.ASNNo + " of an interrupted run was never stored";
+  if (done == NoticeFiles::TakenBack::kCutBack) tell(what + " and is taken out of " + file.FileName);
+  if (done == NoticeFiles::TakenBack::kChanged) {
+    tell(what + ", and " + file.FileName + " has changed since: look whether the partner got that notice");
+  }
+}
+
+// False when another program was quicker.
+bool CompileFrame::Forget(const PendingNotice& notice) {
+  if (partnerkit::Delete(Records(), notice)) return true;
+  if (Records().NativeError() != 0) RaiseStore(*this, "A notice stays pending");
+  return false;
 }
 
 std::int32_t CompileFrame::Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog) {
@@ -181,41 +239,46 @@ bool CompileFrame::Make(Notice& notice) {
   return false;
 }
 
+// A new file has two records: its own, and then that of its draft.
 bool CompileFrame::NotePending(Notice& notice) {
-  for (const FileGrowth& growth : notice.files.Growths()) {
+  const auto note = [&](const std::string& name, const FileGrowth& growth, std::int64_t before, std::uint64_t added) {
     PendingNotice& pending = notice.pending.emplace_back();
     pending.VendorId = notice.asn.VendorId;
     pending.PartnerId = notice.asn.PartnerId;
     pending.ASNNo = Str(notice.asn.ASNNo);
-    pending.FileName = FileSystem().FullName(growth.path);
+    pending.FileName = name;
     pending.NewFile = growth.isNew;
-    pending.LengthBefore = static_cast<std::int64_t>(growth.before);
-    pending.LengthAdded = static_cast<std::int64_t>(growth.added);
-    const bool noted = Try([&] {
+    pending.LengthBefore = before;
+    pending.LengthAdded = static_cast<std::int64_t>(added);
+    return Try([&] {
       if (!Add(Records(), pending)) RaiseStore(*this, "The notice cannot be noted as pending");
       return true;
     });
-    if (!noted) return false;
+  };
+  for (const FileGrowth& growth : notice.files.Growths()) {
+    if (!note(growth.path, growth, static_cast<std::int64_t>(growth.before), growth.added)) return false;
+    if (growth.isNew && !note(growth.draft, growth, kDraft, 0)) return false;
   }
   return true;
 }
 
 // The file's number among the notice's files; nothing, with the cause in ErrorNumber, when it can't be opened.
-std::optional<std::size_t> CompileFrame::OpenFile(Notice& notice, const std::string& path) {
+std::optional<std::size_t> CompileFrame::OpenFile(Notice& notice, const std::string& path, Naming naming) {
   PendingNotice interrupted;
-  interrupted.FileName = FileSystem().FullName(path);
-  // No other program writes to a file that is open here. One that had it before may have been killed, though.
-  const auto open = [&] { return Try([&] { return std::optional(notice.files.Open(path)); }); };
+  interrupted.FileName = NotedName(path, naming);
   const auto isWhole = [&] {
     return Try([&] { return Count(Records(), PendingNotice::kByFileName, interrupted) == 0; });
   };
-  auto file = open();
-  if (!file || isWhole()) return file;
-  Try([&] { notice.files.LetGo(); });
-  TakeUpInterrupted(PendingNotice::kByFileName, interrupted,
-                    [&](std::string_view told) { notice.log.Note(kWarning, told); });
-  file = open();
-  if (!file || isWhole()) return file;
+  for (const bool again : {false, true}) {
+    // The draft of a new file would clear away the one that tells what became of the notice that was to be that file.
+    if ((again || !FileSystem().Exists(interrupted.FileName)) && !isWhole()) {
+      TakeUpInterrupted(interrupted, [&](std::string_view told) { notice.log.Note(kWarning, told); });
+    }
+    auto file = Try([&] { return std::optional(notice.files.Open(interrupted.FileName, naming)); });
+    // No other program writes to a file that is open here. One that had it before may have been killed, though.
+    if (!file || isWhole()) return file;
+    Try([&] { notice.files.LetGo(); });
+  }
   Try([&] { throw RunTimeError(run_time::kPermissionDenied, "An interrupted notice cannot be taken out of " + path); });
   return std::nullopt;
 }
@@ -223,7 +286,7 @@ std::optional<std::size_t> CompileFrame::OpenFile(Notice& notice, const std::str
 bool CompileFrame::Prepare(Notice& notice) {
   if (!inventoryOn_) return true;
   const HandlerOff off(Errors());
-  const auto file = OpenFile(notice, inventoryPath_);
+  const auto file = OpenFile(notice, inventoryPath_, Naming::kGiven);
   if (!file) {
     notice.log.Note(ErrorNumber(), "Open Inventory File", std::string(compile_.inventoryFailed) + inventoryPath_);
     return false;
@@ -255,7 +318,7 @@ bool CompileFrame::OpenOutput(Notice& notice) {
     else path += c;
   }
   const HandlerOff off(Errors());
-  const auto file = OpenFile(notice, path);
+  const auto file = OpenFile(notice, path, path == output_ ? Naming::kGiven : Naming::kMadeUp);
   if (!file) {
     notice.log.Note(ErrorNumber(), "Open ASN File", "Cannot open file " + path);
     return false;
@@ -278,10 +341,14 @@ bool CompileFrame::WriteFiles(Notice& notice) {
 // A file that can't be cut back now is by the next run.
 void CompileFrame::GiveUp(Notice& notice) {
   if (notice.files.Abandon()) ForgetAll(notice);
+  else notice.files.LeaveDrafts();
 }
 
 void CompileFrame::ForgetAll(Notice& notice) {
-  for (const PendingNotice& pending : notice.pending) Try([&] { Forget(pending); });
+  for (const PendingNotice& pending : notice.pending) {
+    const bool done = Try([&] { return Forget(pending), true; });
+    if (!done) notice.files.LeaveDrafts();
+  }
 }
 
 bool CompileFrame::Stamp(Notice& notice) {

@@ -53,7 +53,8 @@ class CompileFrame : public TranslatorBase {
 
   // One notice in the making.
   struct Notice {
-    Notice(CompileFrame& frame, ErrorList& list) : log(frame, "Process", list), files(frame.FileSystem()) {}
+    Notice(CompileFrame& frame, ErrorList& list)
+        : log(frame, "Process", list), files(frame.FileSystem(), frame.ends_) {}
 
     ASN asn;
     PackPointers packs;
@@ -94,11 +95,15 @@ class CompileFrame : public TranslatorBase {
   RowKey KeyOf(const Pack& pack) const;
   ASN AsnOf(const Pack& pack);
   void ListPacks(const PackPointers& packs, RowTable& rows);
-  void TakeUpInterrupted(const Lookup& lookup, const PendingNotice& probe, const Tell& tell);
-  void TakeBack(const PendingNotice& notice, const Tell& tell);
-  void Forget(const PendingNotice& notice);
+  std::string NotedName(const std::string& path, Naming naming);
+  void ClearDrafts(const std::string& path);
+  void TakeUpInterrupted(std::string_view vendorId, std::string_view partnerId, const Tell& tell);
+  void TakeUpInterrupted(const PendingNotice& ofFile, const Tell& tell);
+  void TakeBack(const PendingNotice& file, const PendingNotice* draft, const Tell& tell);
+  bool Forget(const PendingNotice& notice);
   void ForgetAll(Notice& notice);
-  std::optional<std::size_t> OpenFile(Notice& notice, const std::string& path);
+  void WarnOfCircles();
+  std::optional<std::size_t> OpenFile(Notice& notice, const std::string& path, Naming naming);
   bool Make(Notice& notice);
   bool NotePending(Notice& notice);
   bool WriteFiles(Notice& notice);
@@ -114,6 +119,7 @@ class CompileFrame : public TranslatorBase {
   std::string output_;
   std::string inventoryPath_;
   bool inventoryOn_ = false;
+  FileEnds ends_;  // since the listing
   std::vector<ASN> rows_;
   std::map<RowKey, PackPointers> waiting_;
   std::size_t waitingPacks_ = 0;

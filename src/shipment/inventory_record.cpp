@@ -2,6 +2,7 @@
 
 #include "frame/format.h"
 #include "frame/numbers.h"
+#include "frame/outbound_value.h"
 
 namespace partnerkit::shipment {
 
@@ -13,7 +14,8 @@ class Fields {
 
   Fields& Quoted(std::string_view value) {
     Next() += '"';
-    text_.append(value) += '"';
+    AppendValue(value, text_);
+    text_ += '"';
     return *this;
   }
   Fields& Bare(std::string_view value) {

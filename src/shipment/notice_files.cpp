@@ -1,5 +1,6 @@
 #include "shipment/notice_files.h"
 
+#include <array>
 #include <utility>
 
 #include "partnerkit/run_time_error.h"
@@ -8,7 +9,10 @@ namespace partnerkit::shipment {
 
 namespace {
 
-std::string NameUntilWritten(const std::string& path) { return path + ".new"; }
+constexpr std::string_view kLineEnd = "\r\n";
+
+// How often a file that grows while it is being opened is tried again.
+constexpr int kOpenAttempts = 5;
 
 // Whether a file is still to be made. Raises for a folder that isn't there, or that has the name.
 bool IsNew(Files& files, const std::string& path) {
@@ -21,14 +25,30 @@ bool IsNew(Files& files, const std::string& path) {
   }
 }
 
-// Null while another program has it open.
-std::unique_ptr<OutputFile> OpenUnlessInUse(Files& files, const std::string& path) {
+bool EndsLine(std::string_view text) { return text.empty() || text.back() == '\n' || text.back() == '\r'; }
+
+FileEnd EndOf(Files& files, const std::string& path) {
+  const auto file = files.OpenInput(path, Share::kDenyWrite);
+  const std::uint64_t length = file->Length();
+  std::array<char, 1> last{};
+  const std::size_t read = length > 0 ? file->ReadAt(length - 1, last) : 0;
+  return {length, EndsLine({last.data(), read})};
+}
+
+// What `open` gives; null when another program has the file, or has just taken it away.
+template <class F>
+auto UnlessInUse(F open) -> decltype(open()) {
   try {
-    return files.OpenOutput(path, OutputMode::kAppend);
+    return open();
   } catch (const RunTimeError& error) {
-    if (error.Number() != run_time::kPermissionDenied) throw;
+    if (error.Number() != run_time::kPermissionDenied && error.Number() != run_time::kFileNotFound) throw;
     return nullptr;
   }
+}
+
+// Held against everybody, for what is to be removed.
+std::unique_ptr<InputFile> HoldUnlessInUse(Files& files, const std::string& path) {
+  return UnlessInUse([&] { return files.OpenInput(path, Share::kExclusive); });
 }
 
 template <class F>
@@ -41,96 +61,162 @@ bool Done(F operation) {
   }
 }
 
+NoticeFiles::TakenBack RemoveNew(Files& files, const FileGrowth& growth) {
+  const auto file = HoldUnlessInUse(files, growth.path);
+  if (file == nullptr) return NoticeFiles::TakenBack::kInUse;
+  if (file->Length() != growth.added) return NoticeFiles::TakenBack::kChanged;
+  files.Delete(growth.path);
+  return NoticeFiles::TakenBack::kCutBack;
+}
+
+NoticeFiles::TakenBack CutGrownBack(Files& files, const FileGrowth& growth) {
+  const auto file = UnlessInUse([&] { return files.OpenOutput(growth.path, OutputMode::kAppendOwn); });
+  if (file == nullptr) return NoticeFiles::TakenBack::kInUse;
+  const std::uint64_t length = file->Length();
+  if (length < growth.before || length > growth.before + growth.added) return NoticeFiles::TakenBack::kChanged;
+  if (length == growth.before) return NoticeFiles::TakenBack::kUntouched;
+  file->Truncate(growth.before);
+  file->Sync();
+  file->Close();
+  return NoticeFiles::TakenBack::kCutBack;
+}
+
 }  // namespace
 
-std::size_t NoticeFiles::Open(const std::string& path) {
-  Held held;
-  held.path = path;
-  held.isNew = IsNew(files_, path);
-  held.isNamed = !held.isNew;
-  held.file = files_.OpenOutput(held.isNew ? NameUntilWritten(path) : path, OutputMode::kAppend);
-  held.before = held.file->Length();
-  if (held.isNew && held.before > 0) {
-    throw RunTimeError(run_time::kFileExists, "Another file has the name: " + NameUntilWritten(path));
+NoticeFiles::~NoticeFiles() {
+  Abandon();
+  if (!leavesDrafts_) DropDrafts();
+}
+
+std::size_t NoticeFiles::Open(const std::string& path, Naming naming) {
+  if (naming == Naming::kMadeUp && files_.Resolved(path) != path) {
+    throw RunTimeError(run_time::kPathAccess, "The name is a link of somebody else's: " + path);
   }
-  held_.push_back(std::move(held));
+  if (IsNew(files_, path)) {
+    Held held;
+    held.isNamed = false;
+    held.file = files_.OpenDraft(path, held.draft);
+    held_.push_back(std::move(held));
+  } else {
+    held_.push_back(OpenGrowing(path, naming));
+  }
+  held_.back().path = path;
   return held_.size() - 1;
 }
 
+// A file that is held for writing cannot be read beside that, so that it is read before and held again. A device has no
+// length, and cannot be read.
+NoticeFiles::Held NoticeFiles::OpenGrowing(const std::string& path, Naming naming) {
+  const OutputMode mode = naming == Naming::kMadeUp ? OutputMode::kAppendOwn : OutputMode::kAppend;
+  for (int attempt = 0; attempt < kOpenAttempts; ++attempt) {
+    Held held;
+    held.file = files_.OpenOutput(path, mode);
+    held.before = held.file->Length();
+    FileEnd& end = ends_[path];
+    if (held.before == 0) end = {};
+    if (held.before == end.length) {
+      if (!end.endsLine) held.text = kLineEnd;
+      held.begun = held.text.size();
+      return held;
+    }
+    held.file.reset();
+    end = EndOf(files_, path);
+  }
+  throw RunTimeError(run_time::kPermissionDenied, "Another program keeps writing to the file: " + path);
+}
+
 void NoticeFiles::LetGo() {
-  CutBack(held_.back());
+  Held held = std::move(held_.back());
   held_.pop_back();
+  CutBack(held);
+  if (!held.isNamed) files_.Delete(held.draft);
 }
 
 std::vector<FileGrowth> NoticeFiles::Growths() const {
   std::vector<FileGrowth> growths;
-  for (const Held& held : held_) growths.push_back({held.path, held.isNew, held.before, held.text.size()});
+  for (const Held& held : held_) {
+    growths.push_back({held.path, held.draft, !held.draft.empty(), held.before, held.Added().size()});
+  }
   return growths;
 }
 
 void NoticeFiles::Name(Held& held) {
-  if (!IsNew(files_, held.path)) {
-    throw RunTimeError(run_time::kFileExists, "Another program has made the file: " + held.path);
+  try {
+    held.isNamed = files_.RenameNew(held.draft, held.path);
+  } catch (const RunTimeError&) {
+    // It may be named all the same, and only not be known to outlive a power failure.
+    held.isNamed = !files_.Exists(held.draft);
+    throw;
   }
-  files_.Rename(NameUntilWritten(held.path), held.path);
-  held.isNamed = true;
+  if (!held.isNamed) throw RunTimeError(run_time::kFileExists, "There is something of that name by now: " + held.path);
 }
 
 void NoticeFiles::Write() {
   for (Held& held : held_) {
-    if (!held.isNamed) Name(held);
-    held.file->Write(held.text);
+    held.file->Write(held.Added());
     held.file->Sync();
+    if (!held.isNamed) Name(held);
   }
 }
 
 void NoticeFiles::Settle() {
-  // What they hold is on the disk.
-  for (Held& held : std::exchange(held_, {})) Done([&] { held.file->Close(); });
+  for (Held& held : std::exchange(held_, {})) {
+    if (!held.Added().empty()) ends_[held.path] = {held.before + held.Added().size(), EndsLine(held.text)};
+    // What they hold is on the disk.
+    Done([&] { held.file->Close(); });
+  }
 }
 
 void NoticeFiles::CutBack(Held& held) {
-  if (held.file->Length() > held.before) {
+  if (!held.isNamed) return;
+  if (!held.draft.empty()) {
+    files_.Delete(held.path);
+  } else if (held.file->Length() > held.before) {
     held.file->Truncate(held.before);
     held.file->Sync();
   }
-  if (held.isNew) files_.Delete(held.isNamed ? held.path : NameUntilWritten(held.path));
   held.file->Close();
 }
 
 bool NoticeFiles::Abandon() {
   bool all = true;
-  for (Held& held : std::exchange(held_, {})) all = Done([&] { CutBack(held); }) && all;
+  std::vector<Held> drafts;
+  for (Held& held : std::exchange(held_, {})) {
+    all = Done([&] { CutBack(held); }) && all;
+    if (!held.isNamed) drafts.push_back(std::move(held));
+  }
+  held_ = std::move(drafts);
   return all;
 }
 
-bool NoticeFiles::RemoveUnwritten(Files& files, const std::string& path) {
-  const std::string name = NameUntilWritten(path);
-  if (!files.Exists(name)) return true;
-  const auto held = OpenUnlessInUse(files, name);
-  if (held == nullptr) return false;
-  if (held->Length() == 0) files.Delete(name);
-  return true;
+void NoticeFiles::DropDrafts() {
+  for (const Held& held : std::exchange(held_, {})) Done([&] { files_.Delete(held.draft); });
 }
 
 NoticeFiles::TakenBack NoticeFiles::TakeBack(Files& files, const FileGrowth& growth) {
-  if (growth.isNew && files.Exists(NameUntilWritten(growth.path))) {
-    if (!RemoveUnwritten(files, growth.path)) return TakenBack::kInUse;
-    if (!files.Exists(growth.path)) return TakenBack::kUntouched;
+  if (!growth.draft.empty() && files.Exists(growth.draft)) {
+    return HoldUnlessInUse(files, growth.draft) == nullptr ? TakenBack::kInUse : TakenBack::kUntouched;
   }
-  if (!files.Exists(growth.path)) return TakenBack::kChanged;
-  const auto file = OpenUnlessInUse(files, growth.path);
-  if (file == nullptr) return TakenBack::kInUse;
-  const std::uint64_t length = file->Length();
-  if (length < growth.before || length > growth.before + growth.added) return TakenBack::kChanged;
-  const bool grew = length > growth.before;
-  if (grew) {
-    file->Truncate(growth.before);
-    file->Sync();
-  }
-  if (growth.isNew) files.Delete(growth.path);
-  file->Close();
-  return grew ? TakenBack::kCutBack : TakenBack::kUntouched;
+  // A link is somebody else's: the name that was noted was none.
+  if (!files.Exists(growth.path) || files.Resolved(growth.path) != growth.path) return TakenBack::kChanged;
+  return growth.isNew ? RemoveNew(files, growth) : CutGrownBack(files, growth);
+}
+
+bool NoticeFiles::RemoveDraft(Files& files, const std::string& draft) {
+  if (!files.Exists(draft)) return true;
+  const auto held = HoldUnlessInUse(files, draft);
+  if (held == nullptr) return false;
+  files.Delete(draft);
+  return true;
+}
+
+// A new draft clears them away. One that can't be made is missed by nobody.
+void NoticeFiles::ClearDrafts(Files& files, const std::string& path) {
+  Done([&] {
+    std::string draft;
+    const auto file = files.OpenDraft(path, draft);
+    files.Delete(draft);
+  });
 }
 
 }  // namespace partnerkit::shipment

@@ -350,6 +350,7 @@ TEST_F(PosixFilesTest, GivesEachDraftANameOfItsOwn) {
             }),
             0);
   EXPECT_EQ(first, Path(".orders.txt.partnerkit-1"));
+  EXPECT_FALSE(files_.Exists(Path(".orders.txt.partnerkit-3")));
   // What the child left is nobody's now.
   const auto again = files_.OpenDraft(path, first), another = files_.OpenDraft(path, second),
              third = files_.OpenDraft(path, next);

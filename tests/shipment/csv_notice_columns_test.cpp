@@ -159,6 +159,10 @@ const Value kValues[] = {
     {kBulkAdvice, "SHIPNOTETYPECODE", "UPDATE tbVendor SET LabelClass = 'PartnerKit.clsCMLFGPTL'", "00,"},
     // Texts stand as they are, blanks at their ends cut.
     {kMgb, "CONSIGNMENTNOTENO BUYSTORECODE", "UPDATE tbShipment SET ConNoteNo = '  CN,5 \"A\" '", "CN,5 \"A\",0512,"},
+    // Nothing in them breaks a line.
+    {kMgb, "CONSIGNMENTNOTENO BUYSTORECODE",
+     "UPDATE tbShipment SET ConNoteNo = char(13, 10) || 'CN' || char(10) || '5' || char(0, 13) || 'A' || char(10, 32)",
+     "CN 5  A,0512,"},
     {kMgb, "INVOICENO DELREFERENCE BOOKINGNO COMPANYCODE PARTNERSUPPLIERNO PACKERID CONTAINERNO",
      "UPDATE tbPack SET InvoiceNo = NULL, PSlipId = 0; UPDATE tbShipment SET BookingNo = NULL;"
      "UPDATE tbOrder SET CompanyCode = NULL, PartnerSupplierNo = NULL",

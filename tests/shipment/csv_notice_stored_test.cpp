@@ -149,6 +149,16 @@ TEST(CsvNoticeStoredTest, WritesTheInventoryRecordToTheByte) {
       "\"C\",\"\",\"\",\"\",\"\",\"\",\"\"\r\n");
 }
 
+TEST(CsvNoticeStoredTest, KeepsLineEndsOutOfInventoryAndHeader) {
+  PackedTrade trade(kMgb, "CONTAINERNO");
+  trade.UseInventory("stock");
+  trade.Sql("UPDATE tbPartner SET Translator = 'GENTRAN'; UPDATE tbOrder SET PONo = '45' || char(13, 10, 0) || '6'");
+  trade.document.PartnerEDIAddr = "MGB\r\nSTORES";
+  trade.AddPack();
+  EXPECT_THAT(trade.Compiled(), ElementsAre("HEADER,MGB  STORES", "SSCC1,"));
+  EXPECT_THAT(trade.Output("stock"), ElementsAre(HasSubstr("\"0512\",\"45   6\",\"INV77\"")));
+}
+
 TEST(CsvNoticeStoredTest, WritesAnInventoryRecordForEachLineOfAPositiveQuantity) {
   for (const char* className : {kMgb, kMgbbtNotice}) {
     SCOPED_TRACE(className);

@@ -112,6 +112,60 @@ TEST(CsvNoticeTest, ForgetsTheRowsOfAnEarlierListing) {
   EXPECT_EQ(trade.Files(), "");
 }
 
+// --- Packs that lead each other
+
+struct Led {
+  const char* what;
+  std::vector<std::int32_t> leads;  // of the packs 1, 2, ...
+  const char* change;
+  Texts told;
+};
+
+const Led kLed[] = {
+    {"sub packs of sub packs", {0, 1, 2}, "", {}},
+    {"itself",
+     {0, 2},
+     "",
+     {"W Load: Pack 2 (PackNo P2, SSCC SSCC2) leads itself, so that no notice ever holds it: set its LeadPackId to 0"}},
+    {"each other, and one behind them",
+     {4, 4, 1, 3},
+     "",
+     {"W Load: Packs 1 (PackNo P1, SSCC SSCC1), 4 (PackNo P4, SSCC SSCC4), 3 (PackNo P3, SSCC SSCC3) lead each other, "
+      "so that no notice ever holds them: set the LeadPackId of the one that is to lead to 0"}},
+    {"of several statuses",
+     {2, 1},
+     "UPDATE tbPack SET Status = Id * 7 - 7",
+     {"W Load: Packs 1 (PackNo P1, SSCC SSCC1), 2 (PackNo P2, SSCC SSCC2) lead each other, so that no notice ever "
+      "holds them: set the LeadPackId of the one that is to lead to 0"}},
+    {"compiled", {1}, "UPDATE tbPack SET Status = 8", {}},
+    {"of another company", {1}, "UPDATE tbPack SET VendorId = 'OTHER'", {}},
+    {"for another partner", {1}, "UPDATE tbOrder SET PartnerId = 'TOYS'", {}},
+    {"on no shipment", {1}, "UPDATE tbPack SET ShipmentId = 0", {}},
+};
+
+TEST(CsvNoticeTest, TellsOfPacksThatLeadEachOther) {
+  for (const Led& led : kLed) {
+    SCOPED_TRACE(led.what);
+    PackedTrade trade(kMgb, "CONTAINERNO");
+    for (std::size_t n = 0; n < led.leads.size(); ++n) {
+      trade.AddPack([&](Pack& pack) { pack.LeadPackId = led.leads[n], pack.PackNo = "P" + std::to_string(n + 1); });
+    }
+    trade.Sql(led.change);
+    trade.Loaded();
+    Texts told = trade.NewLog();
+    std::erase(told, "0 Load: No Packs found to process.");
+    EXPECT_EQ(told, led.told);
+  }
+}
+
+TEST(CsvNoticeTest, TellsOfTenCirclesOfPacksAndCountsTheRest) {
+  PackedTrade trade(kMgb, "CONTAINERNO");
+  for (int n = 1; n <= 12; ++n) trade.AddPack([&](Pack& pack) { pack.LeadPackId = n; });
+  trade.Loaded();
+  EXPECT_EQ(trade.NewLog().size(), 12U);
+  EXPECT_EQ(trade.NewLog()[10], "W Load: So do packs in 2 more circles of leads");
+}
+
 // --- Lines
 
 struct Lines {

@@ -43,12 +43,12 @@ struct Fault {
 
 const Fault kFaults[] = {
     {"Length", "out/stock", 0, "61 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
-    {"OpenOutput", "stock.new", 0, "61 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
+    {"OpenDraft", "out/stock", 0, "61 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
     {"OpenOutput", "asn.csv", 0, "61 Open ASN File: Cannot open file FOLDERout/asn.csv"},
-    {"Length", "out/stock", 1, "61 Process: Cannot write ASN 1001: It failed: out/stock"},
+    {"OpenInput", "asn.csv", 0, "61 Open ASN File: Cannot open file FOLDERout/asn.csv"},
+    {"Write", "out/stock", 0, "61 Process: Cannot write ASN 1001: It failed: out/stock"},
+    {"Sync", "out/stock", 0, "61 Process: Cannot write ASN 1001: It failed: out/stock"},
     {"Rename", "out/stock", 0, "61 Process: Cannot write ASN 1001: It failed: out/stock"},
-    {"Write", "stock.new", 0, "61 Process: Cannot write ASN 1001: It failed: stock.new"},
-    {"Sync", "stock.new", 0, "61 Process: Cannot write ASN 1001: It failed: stock.new"},
     {"Write", "asn.csv", 0, "61 Process: Cannot write ASN 1001: It failed: asn.csv"},
     {"Sync", "asn.csv", 0, "61 Process: Cannot write ASN 1001: It failed: asn.csv"},
 };
@@ -102,6 +102,7 @@ struct Killed {
   std::string file;    // the output; "-" for none
   std::string left;    // of it
   Told told;
+  bool draft = false;  // there is one still
 };
 
 constexpr const char* kGrown = "0, 9, 13";
@@ -116,19 +117,28 @@ const Killed kKilled[] = {
     {"and the file is shorter than it was", kGrown, "EARL", "EARL", kSeen},
     {"and the file is gone", kGrown, "-", "-", kSeen},
     {"with a file that was there empty", "0, 0, 13", "", "", kNothing},
-    {"with a new file", kMade, "", "-", kNothing},
-    {"with a new file begun", kMade, "SSCC1", "-", kOut},
+    {"with a new file", kMade, kNotice, "-", kOut},
+    {"with a new file that somebody emptied", kMade, "", "", kSeen},
     {"with a new file that somebody filled", kMade, kNotice + "theirs", kNotice + "theirs", kSeen},
     {"with a new file that is gone", kMade, "-", "-", kSeen},
+    // Before the draft had its name: what has it is another program's, of whatever length.
+    {"with a draft", kMade, "-", "-", kNothing, true},
+    {"with a draft, and somebody made the file", kMade, kNotice, kNotice, kNothing, true},
 };
 
+constexpr const char* kDraftOfOutput = "out/.asn.csv.partnerkit-1";
+
 struct KilledTrade : FiledTrade {
-  KilledTrade(const std::string& growth, const std::string& file, const char* partner = "MGB") {
-    Sql(Path("INSERT INTO tbPendingNotice(VendorId, PartnerId, ASNNo, FileName, NewFile, LengthBefore, LengthAdded) "
-             "VALUES('ACME', '") +
-        partner + Path("', '1001', 'FOLDERout/asn.csv', ") + growth + ")");
+  KilledTrade(const std::string& growth, const std::string& file, const std::string& partner = "MGB") {
+    Note(partner, "out/asn.csv", growth);
+    if (growth == kMade) Note(partner, kDraftOfOutput, "1, -1, 0");
     folder.Write("out/asn.csv", file);
     if (file == "-") std::filesystem::remove(folder / "out/asn.csv");
+  }
+  void Note(const std::string& partner, const std::string& name, const std::string& growth) {
+    Sql("INSERT INTO tbPendingNotice(VendorId, PartnerId, ASNNo, FileName, NewFile, LengthBefore, LengthAdded) "
+        "VALUES('ACME', '" +
+        partner + "', '1001', '" + folder / name + "', " + growth + ")");
   }
 };
 
@@ -136,7 +146,9 @@ TEST(NoticeFilesTest, AreTakenUpAfterAKilledRun) {
   for (const Killed& killed : kKilled) {
     SCOPED_TRACE(killed.what);
     KilledTrade trade(killed.growth, killed.file);
+    if (killed.draft) trade.folder.Write(kDraftOfOutput, "SSCC1,10");
     trade.Loaded();
+    EXPECT_FALSE(trade.folder.Has(kDraftOfOutput));
     EXPECT_EQ(trade.folder.Has("out/asn.csv") ? trade.folder.Read("out/asn.csv") : "-", killed.left);
     EXPECT_EQ(trade.Pending(), 0);
     const Texts told[] = {
@@ -165,22 +177,26 @@ TEST(NoticeFilesTest, AreFoundAgainFromAnotherFolder) {
   EXPECT_THAT(trade.Output(), ElementsAre("EARLIER"));
 }
 
-// Before it had its name.
-TEST(NoticeFilesTest, LeaveNoNewFileBehindAKilledRun) {
-  KilledTrade trade(kMade, "-");
-  trade.folder.Write("out/asn.csv.new", "");
-  trade.Loaded();
-  EXPECT_EQ(trade.Files() + std::to_string(trade.Pending()), "0");
-  EXPECT_THAT(trade.NewLog(), IsEmpty());
-  // Killed even earlier.
-  trade.folder.Write("out/asn.csv.new", "");
-  trade.folder.Write("out/stock.new", "");
-  trade.Loaded();
-  EXPECT_EQ(trade.Files(), "");
-  // The number that the name of its file would have wasn't given yet, and comes again.
-  trade.folder.Write("out/asn1001.csv.new", "");
+// Before anything was noted: its number comes again, and with it the name.
+TEST(NoticeFilesTest, LeaveNoDraftBehindARunKilledAtOnce) {
+  FiledTrade trade;
+  trade.folder.Write("out/.asn1001.csv.partnerkit-1", "");
+  trade.folder.Write("out/.stock.partnerkit-1", "");
   EXPECT_EQ(trade.Run("out/asn*.csv").front().result, 1);
-  EXPECT_EQ(trade.Files(), "asn1001.csv stock");
+  EXPECT_EQ(trade.Files(), "asn.csv asn1001.csv stock");
+  // And another program made the files then.
+  trade.folder.Write(kDraftOfOutput, "");
+  trade.folder.Write("out/.stock.partnerkit-1", "");
+  trade.folder.Write("out/.stock.partnerkit-2", "");
+  trade.Loaded();
+  EXPECT_EQ(trade.Files(), "asn.csv asn1001.csv stock");
+}
+
+TEST(NoticeFilesTest, KeepTheDraftsThatAnotherPartnersNoticeIsNotedWith) {
+  KilledTrade trade(kMade, "-", "TOYS");
+  trade.folder.Write(kDraftOfOutput, kNotice);
+  trade.Loaded();
+  EXPECT_TRUE(trade.folder.Has(kDraftOfOutput));
 }
 
 // Another partner's notice, of a document that writes to the same file.
@@ -195,6 +211,15 @@ TEST(NoticeFilesTest, AreTakenUpByARowToo) {
   EXPECT_EQ(outcome.result, 1);
   EXPECT_THAT(trade.Output(), ElementsAre("EARLIER", "SSCC1,1002,"));
   EXPECT_EQ(trade.Pending(), 0);
+}
+
+// A new draft takes the place of the one that was left, which told that the file never had its name.
+TEST(NoticeFilesTest, AreTakenUpBeforeTheirDraftIsCleared) {
+  KilledTrade trade(kMade, "-", "TOYS");
+  trade.folder.Write(kDraftOfOutput, kNotice);
+  const auto outcome = trade.Run().front();
+  EXPECT_THAT(outcome.told, ElementsAre(HasSubstr("Pack SSCC1 added"), HasSubstr("compile completed")));
+  EXPECT_EQ(trade.Files() + " " + std::to_string(trade.Pending()), "asn.csv stock 0");
 }
 
 TEST(NoticeFilesTest, TurnRowsAwayWhileTheyCannotBeTakenUp) {
@@ -221,7 +246,6 @@ TEST(NoticeFilesTest, TurnARowAwayWhileAnotherProgramHoldsThem) {
   const Case cases[] = {
       {"out/asn.csv", "70 Open ASN File: Cannot open file FOLDERout/asn.csv"},
       {"out/stock", "70 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
-      {"out/stock.new", "70 Open Inventory File: Cannot open inventory file FOLDERout/stock"},
   };
   for (const Case& each : cases) {
     SCOPED_TRACE(each.held);
@@ -243,28 +267,162 @@ TEST(NoticeFilesTest, TurnARowAwayWhileAnotherProgramHoldsThem) {
 
 // It may be at work on that very notice.
 TEST(NoticeFilesTest, AreNotTakenUpWhileAnotherProgramHoldsThem) {
-  for (const char* held : {"out/asn.csv", "out/asn.csv.new"}) {
+  for (const char* held : {"out/asn.csv", kDraftOfOutput}) {
     SCOPED_TRACE(held);
     KilledTrade trade(kMade, "-");
-    trade.folder.Write(held, "");
+    trade.folder.Write(held, kNotice);
     {
       const OtherProgram other(trade.folder / held);
       trade.Loaded();
       EXPECT_TRUE(trade.folder.Has(held));
-      EXPECT_EQ(trade.Pending(), 1);
+      EXPECT_EQ(trade.Pending(), 2);
+      EXPECT_THAT(trade.NewLog(), IsEmpty());
     }
     trade.Loaded();
     EXPECT_EQ(trade.Files() + std::to_string(trade.Pending()), "0");
-    EXPECT_THAT(trade.NewLog(), IsEmpty());
   }
 }
 
-TEST(NoticeFilesTest, GrowByNothingWhenSomebodyElseHasTheNewName) {
+// What happens at the moment in which a new file gets its name.
+struct NamingFiles : FaultyFiles {
+  using FaultyFiles::FaultyFiles;
+  bool RenameNew(const std::string& from, const std::string& to) override {
+    atNaming(from, to);
+    return FaultyFiles::RenameNew(from, to);
+  }
+
+  std::function<void(const std::string&, const std::string&)> atNaming;
+};
+
+TEST(NoticeFilesTest, GetTheirNamesWhenTheyAreWhole) {
   FiledTrade trade;
-  trade.folder.Write("out/stock.new", "theirs");
-  EXPECT_EQ(trade.Run().front().told,
-            Texts{trade.Path("58 Open Inventory File: Cannot open inventory file FOLDERout/stock")});
-  EXPECT_EQ(trade.folder.Read("out/stock.new"), "theirs");
+  NamingFiles files(trade.faulty);
+  trade.ports.files = &files;
+  Texts named;
+  files.atNaming = [&](const std::string& from, const std::string& to) {
+    named.push_back(to.substr(to.rfind('/') + 1) + " " + std::to_string(std::filesystem::file_size(from)) +
+                    (std::filesystem::exists(to) ? " too late" : ""));
+  };
+  EXPECT_EQ(trade.Run("out/asn*.csv").front().result, 1);
+  EXPECT_THAT(named, ElementsAre("stock 150", "asn1001.csv 13"));
+  EXPECT_THAT(trade.Output("out/asn1001.csv"), ElementsAre("SSCC1,1001,"));
+  EXPECT_EQ(trade.Pending(), 0);
+}
+
+TEST(NoticeFilesTest, NeverTakeTheNameOfAFileThatAnotherProgramMade) {
+  FiledTrade trade;
+  NamingFiles files(trade.faulty);
+  trade.ports.files = &files;
+  files.atNaming = [&](const std::string&, const std::string& to) {
+    if (to.ends_with(".csv")) trade.folder.Write("out/asn1001.csv", "theirs");
+  };
+  const auto outcome = trade.Run("out/asn*.csv").front();
+  EXPECT_EQ(outcome.told.back(),
+            trade.Path("58 Process: Cannot write ASN 1001: There is something of that name by now: "
+                       "FOLDERout/asn1001.csv"));
+  EXPECT_EQ(trade.folder.Read("out/asn1001.csv"), "theirs");
+  EXPECT_EQ(trade.Files(), "asn.csv asn1001.csv");
+  EXPECT_EQ(trade.Stamps() + " " + std::to_string(trade.Pending()), "0/4 0");
+}
+
+// --- Links
+
+TEST(NoticeFilesTest, FollowNoLinkUnderANameThatWasMadeUp) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"victim", "75 Open ASN File: Cannot open file FOLDERout/asn1001.csv"},
+      {"nowhere", "58 Process: Cannot write ASN 1001: There is something of that name by now: FOLDERout/asn1001.csv"},
+  };
+  for (const auto& [target, told] : cases) {
+    SCOPED_TRACE(target);
+    FiledTrade trade;
+    trade.folder.Write("victim", kEarlier);
+    std::filesystem::create_symlink(trade.folder / target, trade.folder / "out/asn1001.csv");
+    EXPECT_EQ(trade.Run("out/asn*.csv").front().told.back(), trade.Path(told));
+    EXPECT_EQ(trade.folder.Read("victim"), kEarlier);
+    EXPECT_FALSE(trade.folder.Has("nowhere"));
+    EXPECT_EQ(trade.Files(), "asn.csv asn1001.csv");
+    EXPECT_EQ(trade.Run("out/asn*.csv").front().result, 1);
+    EXPECT_THAT(trade.Output("out/asn1002.csv"), ElementsAre("SSCC1,1002,"));
+  }
+}
+
+TEST(NoticeFilesTest, AreNotTakenUpThroughALinkPlantedSince) {
+  for (const char* growth : {kGrown, kMade}) {
+    SCOPED_TRACE(growth);
+    KilledTrade trade(growth, "-");
+    const std::string content = growth == kMade ? kNotice : kEarlier + kNotice;
+    trade.folder.Write("victim", content);
+    std::filesystem::create_symlink(trade.folder / "victim", trade.folder / "out/asn.csv");
+    trade.Loaded();
+    EXPECT_EQ(trade.folder.Read("victim"), content);
+    EXPECT_THAT(trade.NewLog(), ElementsAre(HasSubstr("asn.csv has changed since")));
+  }
+}
+
+// The user's own, and where it led to when the notice was written is where it is taken out again.
+TEST(NoticeFilesTest, GoWhereTheUsersLinkLeads) {
+  FiledTrade trade;
+  trade.folder.Write("first", kEarlier);
+  trade.folder.Write("second", kEarlier);
+  std::filesystem::remove(trade.folder / "out/asn.csv");
+  std::filesystem::create_symlink(trade.folder / "first", trade.folder / "out/asn.csv");
+  const auto translator = trade.Loaded();
+  trade.Sql("UPDATE tbPack SET Status = 8");
+  trade.faulty.Fail("Truncate", "first", run_time::kDeviceError);
+  EXPECT_EQ(trade.Process(*translator).result, 0);
+  EXPECT_EQ(trade.folder.Read("first"), kEarlier + kNotice);
+  std::filesystem::remove(trade.folder / "out/asn.csv");
+  std::filesystem::create_symlink(trade.folder / "second", trade.folder / "out/asn.csv");
+  trade.Sql("UPDATE tbPack SET Status = 4");
+  EXPECT_EQ(trade.Run().front().result, 1);
+  EXPECT_EQ(trade.folder.Read("first"), kEarlier);
+  EXPECT_THAT(LinesOf(trade.folder.Read("second")), ElementsAre("EARLIER", "SSCC1,1002,"));
+}
+
+// --- Files whose last line has no end
+
+TEST(NoticeFilesTest, StartANoticeOnALineOfItsOwn) {
+  struct Case {
+    const char* before;
+    const char* after;  // one notice without lines, and two with
+  };
+  const Case cases[] = {
+      {"EARLIER", "EARLIER\r\nSSCC2,1002,\r\nSSCC3,1003,\r\n"},
+      {"EARLIER\n", "EARLIER\nSSCC2,1002,\r\nSSCC3,1003,\r\n"},
+      {"EARLIER\r", "EARLIER\rSSCC2,1002,\r\nSSCC3,1003,\r\n"},
+      {"", "SSCC2,1002,\r\nSSCC3,1003,\r\n"},
+  };
+  for (const Case& each : cases) {
+    SCOPED_TRACE(each.before);
+    FiledTrade trade;
+    trade.Sql("DELETE FROM tbPackLine");
+    for (const int order : {2, 3}) {
+      trade.AddOrder();
+      trade.AddPack([&](Pack& pack) { pack.OrderId = order; });
+    }
+    trade.folder.Write("out/asn.csv", each.before);
+    const auto translator = trade.Loaded();
+    EXPECT_EQ(trade.Process(*translator, 0).result, 1);
+    EXPECT_EQ(trade.folder.Read("out/asn.csv"), each.before);
+    trade.Process(*translator, 1);
+    trade.Process(*translator, 2);
+    EXPECT_EQ(trade.folder.Read("out/asn.csv"), each.after);
+  }
+}
+
+// At once, and by the next run when that fails.
+TEST(NoticeFilesTest, LoseTheLineEndWithTheNotice) {
+  for (const int failures : {0, 1}) {
+    FiledTrade trade;
+    trade.folder.Write("out/asn.csv", "EARLIER");
+    const auto translator = trade.Loaded();
+    trade.Sql("UPDATE tbPack SET Status = 8");
+    trade.faulty.Fail("Truncate", "asn.csv", run_time::kDeviceError, failures);
+    EXPECT_EQ(trade.Process(*translator).result, 0);
+    EXPECT_EQ(trade.folder.Read("out/asn.csv"), failures == 0 ? "EARLIER" : "EARLIER\r\n" + kNotice);
+    trade.Loaded();
+    EXPECT_EQ(trade.folder.Read("out/asn.csv"), "EARLIER");
+  }
 }
 
 TEST(NoticeFilesTest, AreCutBackWithTheRunThatIsGivenUp) {

@@ -18,7 +18,7 @@ from workspace import must
 NAME = "clsMGB856csv"
 COLUMNS = ("CONTAINERNO", "SHIPNOTENO", "CONSIGNMENTNOTENO", "ORDERNO", "APN", "QUANTITYSHIPPED")
 PRODUCTS = ("9312345000012", "9312345000029", "9312345000036")
-EARLIER = b"what was sent last week\r\n"
+EARLIER = b"what was sent last week"  # its last line has no end
 INVENTORY = "outbox/stock.csv"
 TOLD_OF = {"stored": "SELECT Id, OrderNo FROM tbASN", "column": 3}
 WAITING = "SELECT COUNT(*) FROM tbPack WHERE Status < 8"
@@ -43,6 +43,7 @@ class Packed:
     def __init__(self, size):
         self.lines = {}       # by SSCC
         self.inventory = {}
+        self.orders = {}      # the SSCCs of each
         shipments, orders, packs = size
         self.records = {
             "System": {"UserId": "torture"},
@@ -83,6 +84,7 @@ class Packed:
         self.records["Pack"].append({"Id": pack, "PSlipId": order, "OrderId": order, "ShipmentId": shipment, "Status": 4,
                                      "VendorId": "ACME", "ShipToCode": "0900", "BuyStoreCode": "0512", "SSCC": sscc,
                                      "CartonCount": 1})
+        self.orders.setdefault(order, []).append(sscc)
         self.lines[sscc], self.inventory[sscc] = [], []
         for product in PRODUCTS[:1 + pack % 3]:
             self.records["PackLine"].append({"PackId": pack, "PSlipLineId": order, "APN": product, "Quantity": pack})
@@ -90,6 +92,14 @@ class Packed:
             self.inventory[sscc].append(
                 f'"MGBSTORES","%09d",20060308,1015,"CN{shipment}",20060320,20060320,"0512","PO{order}","",'
                 f'"IN{product[-3:]}","{product}",9,{pack},{pack},"S","","","PK1","{order}","LL{order}","TOLL"\r\n')
+
+
+    def notice(self, number, packs):
+        lines = "".join(line % number for sscc in packs for line in self.lines[sscc])
+        return f"HEADER,MGBSTORES\r\n{lines}".encode()
+
+    def stock(self, number, packs):
+        return "".join(line % int(number) for sscc in packs for line in self.inventory[sscc]).encode()
 
 
 class NoticeScenario:
@@ -124,7 +134,9 @@ class NoticeTrade:
     def __init__(self, _):
         self.verdict = self
 
-    struck_violations = staticmethod(verdict.struck_violations)
+    @staticmethod
+    def struck_violations(scenario, folder, struck):
+        return verdict.struck_violations(scenario, folder, struck) + reader_violations(scenario, folder)
 
     @staticmethod
     def violations(scenario, folder, program, last, *, earlier=()):
@@ -135,6 +147,35 @@ class NoticeTrade:
             found += verdict.log_violations(folder, program)
             found += told.violations(folder, [*earlier, last], **TOLD_OF)
         return found
+
+
+def ended(text):
+    return text + b"\r\n" if text else text
+
+
+def reader_violations(scenario, folder):
+    """What a reader of the outbox finds at this moment: no file that was made is less than a whole notice of a stored or a
+    pending record. Files that were there grow, and are taken up where they stood."""
+    if scenario.earlier:
+        return []
+    connection = sqlite3.connect(folder / verdict.DATABASE)
+    try:
+        numbers = {number for number, in connection.execute(
+            "SELECT ASNNo FROM tbASN UNION SELECT ASNNo FROM tbPendingNotice")}
+    finally:
+        connection.close()
+    packed = scenario.packed
+    found = []
+    for path in (folder / "outbox").glob(pathlib.Path(scenario.output).name):
+        number = path.stem.removeprefix("asn")
+        wholes = [packed.notice(number, packs) for packs in packed.orders.values()] if number in numbers else []
+        if path.read_bytes() not in wholes:
+            found.append(f"a reader finds {path.name}, which is no whole notice")
+    stock = folder / INVENTORY
+    wholes = tuple(packed.stock(number, packs) for number in numbers for packs in packed.orders.values())
+    if stock.exists() and not (wholes and stock.read_bytes().startswith(wholes)):
+        found.append(f"a reader finds {stock.name}, which is less than one notice's")
+    return found
 
 
 def store_violations(scenario, folder, outputs):
@@ -169,13 +210,10 @@ def store_violations(scenario, folder, outputs):
 
 def file_violations(scenario, folder, stored, holders, outputs):
     """The files hold each stored notice once, in the order in which they were stored, and nothing else."""
-    notices, inventory = {}, scenario.earlier
+    notices, inventory = {}, ended(scenario.earlier)
     for key, number, *_ in stored:
-        text = "HEADER,MGBSTORES\r\n" + "".join(line % number for sscc in holders[key]
-                                                for line in scenario.packed.lines[sscc])
-        notices[number] = text.encode()
-        inventory += "".join(line % int(number) for sscc in holders[key]
-                             for line in scenario.packed.inventory[sscc]).encode()
+        notices[number] = scenario.packed.notice(number, holders[key])
+        inventory += scenario.packed.stock(number, holders[key])
     found = []
     for output in outputs:
         if "*" in output:
@@ -206,9 +244,10 @@ def file_violations(scenario, folder, stored, holders, outputs):
 def single_violations(scenario, path, notices):
     """Takes out of `notices` those that the file holds."""
     content = verdict.read(path)
-    if not content.startswith(scenario.earlier):
-        return [f"{path.name} has lost what it held before"]
-    content = content[len(scenario.earlier):]
+    earlier = ended(scenario.earlier)
+    if not content.startswith(earlier):
+        return [f"{path.name} has lost what it held before, or has it on a line with what came then"]
+    content = content[len(earlier):]
     for number in list(notices):
         if content.startswith(notices[number]):
             content = content[len(notices.pop(number)):]

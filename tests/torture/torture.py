@@ -40,8 +40,8 @@ from workspace import HarnessError, Program, Scenario, trace_of
 
 # The order file's own operations, told from the store's by the name of the file: what settling and its recovery do.
 SETTLING = ("po.csv", "orders.edi", "orders.tmp", "FA_PO_", "inbox", "backup", "outbox")
-# The same of a notice: its files and the notes beside them.
-NOTICE_FILES = ("asn", "stock", "outbox")
+# The same of a notice: its files, their drafts, and the folder.
+NOTICE_FILES = ("asn", "stock", ".asn", ".stock", "outbox")
 
 # Behind a write, a truncation or a sync the disk is as it is before the next operation.
 EVERY = {"rename": ("kill-before", "kill-after"), "unlink": ("kill-before", "kill-after"),

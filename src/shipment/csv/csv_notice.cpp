@@ -4,6 +4,7 @@
 
 #include "frame/delimited.h"
 #include "frame/numbers.h"
+#include "frame/outbound_value.h"
 #include "shipment/inventory_record.h"
 
 namespace partnerkit::shipment {
@@ -115,8 +116,12 @@ bool CsvNotice::Number(Notice& notice) {
 
 bool CsvNotice::OpenOutput(Notice& notice) {
   if (!CompileFrame::OpenOutput(notice)) return false;
-  if (IsGentran())
-    notice.files.Text(notice.output).append("HEADER,").append(Document().PartnerEDIAddr).append(kLineEnd);
+  if (IsGentran()) {
+    std::string& text = notice.files.Text(notice.output);
+    text += "HEADER,";
+    AppendValue(Document().PartnerEDIAddr, text);
+    text += kLineEnd;
+  }
   return true;
 }
 
