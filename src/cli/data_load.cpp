@@ -34,7 +34,7 @@ class Storer : public DataTaker {
     for (const Member& member : item.type->members) {
       if (member.role == MemberRole::kOwner) NoteOwner(item, member);
     }
-    if (!store_.ReplaceOrAdd(*item.type, item.record.get())) TellRefused(item);
+    if (!Put(*item.type, item.record.get())) TellRefused(item);
     for (const NestedKind& nested : NestedKinds()) {
       if (nested.owner == item.type) StoreParts(nested, item);
     }
@@ -60,6 +60,14 @@ class Storer : public DataTaker {
   const Loaded& Done() const { return loaded_; }
 
  private:
+  // Most loads are of new records only: until one is there already, none is looked for.
+  bool Put(const RecordType& type, void* record) {
+    bool& allNew = allNew_.try_emplace(&type, true).first->second;
+    if (allNew && store_.Add(type, record)) return true;
+    allNew = false;
+    return store_.ReplaceOrAdd(type, record);
+  }
+
   // An owner that wasn't there when the first record that names it was.
   struct Awaited {
     DataItem item;  // without the record
@@ -131,6 +139,7 @@ class Storer : public DataTaker {
   host::SqlHost& host_;
   host::SqlStore& store_;
   Loaded loaded_;
+  std::map<const RecordType*, bool> allNew_;  // of a kind, so far
   std::vector<Awaited> awaited_;
   std::map<std::string_view, std::unordered_set<std::int64_t>> owners_;  // named so far, by their kind
 };

@@ -96,7 +96,7 @@ class LabelRun {
   }
 
   std::string Printer() const {
-    const std::string name = PrinterName();
+    std::string name = PrinterName();
     CheckPrinter(spooler_, name, workspace_);
     return name;
   }

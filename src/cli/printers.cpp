@@ -43,6 +43,7 @@ std::vector<Printer> Chosen(const spool::PrinterSpooler& spooler, const std::vec
                             const Workspace& workspace) {
   if (names.empty()) return spooler.Printers();
   std::vector<Printer> chosen;
+  chosen.reserve(names.size());
   for (const std::string& name : names) {
     chosen.push_back(CheckPrinter(spooler, name, workspace));
   }

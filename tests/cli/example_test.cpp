@@ -45,15 +45,16 @@ TEST_F(Example, OfEveryClassLoadsAndWorks) {
   for (const PublicClass& row : Catalogue()) {
     SCOPED_TRACE(row.progId);
     const std::string name(row.progId.substr(row.progId.find('.') + 1));
+    const std::string within = name + "/";
     EXPECT_EQ(Run({"new", name}).status, 0);
     const Ran made = Run({"data", "example", name, "--out", name});
     EXPECT_EQ(made.status, 0) << made.err;
-    EXPECT_EQ(Run({"data", "example", std::string(row.progId)}).out, folder.Read(name + "/" + name + ".json"));
+    EXPECT_EQ(Run({"data", "example", std::string(row.progId)}).out, folder.Read(within + name + ".json"));
     auto commands = CommandsIn(made.out);
     ASSERT_EQ(commands.size(), 3U);
     for (auto& command : commands) {
       for (std::string& word : command) {
-        if (word.ends_with(".json") || word.find('/') != std::string::npos) word.insert(0, name + "/");
+        if (word.ends_with(".json") || word.find('/') != std::string::npos) word.insert(0, within);
       }
       command.insert(command.begin(), {"--workspace", name});
     }

@@ -16,10 +16,9 @@ class Moved : public Supplier {
     folder.Write("first/inbox/orders.csv", Sample("orders.csv"));
     folder.Write("more.json", R"({"Printer": [{"Name": "dock", "Kind": "file", "Target": "${workspace}/outbox"}],
                                   "System": {"ComPort": "${workspace}/port"}})");
-    EXPECT_EQ(Run({"--workspace", "first", "data", "load", PARTNERKIT_SOURCE_DIR "/samples/mgb850/records.json",
-                   PARTNERKIT_SOURCE_DIR "/tests/data/cartons.json", "more.json"})
-                  .status,
-              0);
+    const std::string samples = PARTNERKIT_SOURCE_DIR "/samples/mgb850/records.json";
+    const std::string cartons = PARTNERKIT_SOURCE_DIR "/tests/data/cartons.json";
+    EXPECT_EQ(Run({"--workspace", "first", "data", "load", samples, cartons, "more.json"}).status, 0);
   }
   // Imports a row of the workspace's order file. Gives how many lines its backup file has then.
   std::ptrdiff_t LinesAfter(const std::string& workspace, const std::string& row) {
