@@ -346,7 +346,10 @@ void CompileFrame::GiveUp(Notice& notice) {
 
 void CompileFrame::ForgetAll(Notice& notice) {
   for (const PendingNotice& pending : notice.pending) {
-    const bool done = Try([&] { return Forget(pending), true; });
+    const bool done = Try([&] {
+      Forget(pending);
+      return true;
+    });
     if (!done) notice.files.LeaveDrafts();
   }
 }

@@ -62,8 +62,11 @@ bool Done(F operation) {
 }
 
 NoticeFiles::TakenBack RemoveNew(Files& files, const FileGrowth& growth) {
-  const auto file = HoldUnlessInUse(files, growth.path);
+  const bool isDraft = !growth.draft.empty() && files.Exists(growth.draft);
+  const auto file = HoldUnlessInUse(files, isDraft ? growth.draft : growth.path);
   if (file == nullptr) return NoticeFiles::TakenBack::kInUse;
+  // Where files are renamed by a second link, a kill between the two leaves both names.
+  if (isDraft && !file->StillNamed(growth.path)) return NoticeFiles::TakenBack::kUntouched;
   if (file->Length() != growth.added) return NoticeFiles::TakenBack::kChanged;
   files.Delete(growth.path);
   return NoticeFiles::TakenBack::kCutBack;
@@ -146,6 +149,7 @@ void NoticeFiles::Name(Held& held) {
   } catch (const RunTimeError&) {
     // It may be named all the same, and only not be known to outlive a power failure.
     held.isNamed = !files_.Exists(held.draft);
+    held.mayBe = !held.isNamed && files_.Exists(held.path);
     throw;
   }
   if (!held.isNamed) throw RunTimeError(run_time::kFileExists, "There is something of that name by now: " + held.path);
@@ -182,7 +186,7 @@ bool NoticeFiles::Abandon() {
   bool all = true;
   std::vector<Held> drafts;
   for (Held& held : std::exchange(held_, {})) {
-    all = Done([&] { CutBack(held); }) && all;
+    all = Done([&] { CutBack(held); }) && !held.mayBe && all;
     if (!held.isNamed) drafts.push_back(std::move(held));
   }
   held_ = std::move(drafts);
@@ -194,9 +198,7 @@ void NoticeFiles::DropDrafts() {
 }
 
 NoticeFiles::TakenBack NoticeFiles::TakeBack(Files& files, const FileGrowth& growth) {
-  if (!growth.draft.empty() && files.Exists(growth.draft)) {
-    return HoldUnlessInUse(files, growth.draft) == nullptr ? TakenBack::kInUse : TakenBack::kUntouched;
-  }
+  if (!growth.draft.empty() && files.Exists(growth.draft)) return RemoveNew(files, growth);
   // A link is somebody else's: the name that was noted was none.
   if (!files.Exists(growth.path) || files.Resolved(growth.path) != growth.path) return TakenBack::kChanged;
   return growth.isNew ? RemoveNew(files, growth) : CutGrownBack(files, growth);

@@ -87,7 +87,8 @@ class NoticeFiles {
     std::uint64_t before = 0;
     std::string text;
     std::size_t begun = 0;  // of the text: the line end that the file lacked
-    bool isNamed = true;    // a new file has its own name
+    bool isNamed = true;    // a new file has its own name,
+    bool mayBe = false;     // or may have it and its draft's
 
     // A notice of no text doesn't end a line either.
     std::string_view Added() const { return text.size() > begun ? std::string_view(text) : std::string_view(); }

@@ -325,6 +325,24 @@ TEST(NoticeFilesTest, NeverTakeTheNameOfAFileThatAnotherProgramMade) {
   EXPECT_EQ(trade.Stamps() + " " + std::to_string(trade.Pending()), "0/4 0");
 }
 
+// Some file systems rename by a second link. Killed between the two, or failing there, both names are one file's.
+TEST(NoticeFilesTest, AreTakenUpWithBothTheirNames) {
+  FiledTrade trade;
+  std::filesystem::remove(trade.folder / "out/asn.csv");
+  NamingFiles files(trade.faulty);
+  trade.ports.files = &files;
+  files.atNaming = [](const std::string& from, const std::string& to) {
+    if (!to.ends_with(".csv")) return;
+    std::filesystem::create_hard_link(from, to);
+    throw RunTimeError(run_time::kPathAccess, "The old name stays");
+  };
+  EXPECT_EQ(trade.Run().front().result, 0);
+  EXPECT_EQ(trade.Files(), ".asn.csv.partnerkit-1 asn.csv");
+  trade.Loaded();
+  EXPECT_EQ(trade.Files() + std::to_string(trade.Pending()), "0");
+  EXPECT_THAT(trade.NewLog(), Contains(trade.Path(kTakenOut)));
+}
+
 // --- Links
 
 TEST(NoticeFilesTest, FollowNoLinkUnderANameThatWasMadeUp) {
