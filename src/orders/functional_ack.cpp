@@ -52,7 +52,8 @@ class AckFile {
  private:
   void CopyEarlier() {
     std::vector<char> block(64 * 1024);
-    for (std::uint64_t offset = 0; const std::size_t read = earlier_->ReadAt(offset, block); offset += read) {
+    std::uint64_t offset = 0;
+    for (std::size_t read; (read = earlier_->ReadAt(offset, block)) > 0; offset += read) {
       draft_->Write({block.data(), read});
     }
     draft_->TakeRights(earlier_->Rights(), Take::kAll);

@@ -93,7 +93,7 @@ ProductPrice OrderChecks::ReadPrice(std::string_view productNo, bool needed) {
 
 ProductPrice OrderChecks::CheckPrice(const LineClaims& line) {
   const EDIDoc& document = translator_.Document();
-  const ProductPrice price = ReadPrice(line.productNo, line.needsPrice);
+  ProductPrice price = ReadPrice(line.productNo, line.needsPrice);
   if (document.ValidateCost && !Says(line.cost, price.Cost)) {
     RejectProduct(Disagreement(line.productNo, " cost price ", line.cost, "cost ", NumberText(price.Cost)));
   }

@@ -155,7 +155,9 @@ TEST(X12OddFilesTest, ReadsFilesWithAByteOrderMarkOrCtrlZ) {
     trade.document.AckFolder = Text();
     const std::string file = trade.File(trade.Body()), failing = trade.File(trade.Body("450002", "0999"));
     // Old systems append to a file behind its end.
-    auto run = trade.Import(mark + trade.Sent(file) + end + trade.Sent(failing) + end);
+    std::string both = mark;
+    for (const std::string& sent : {file, failing}) both.append(trade.Sent(sent)).append(end);
+    auto run = trade.Import(both);
     EXPECT_EQ(run.rows, 2);
     EXPECT_THAT(trade.StoredOrders(), ElementsAre("450001/0"));
     const std::string left = trade.Orders();

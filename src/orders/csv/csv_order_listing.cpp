@@ -1,5 +1,6 @@
 // Listing a CSV order file: from the map and the file to the rows.
 #include <algorithm>
+#include <exception>
 
 #include "frame/dates.h"
 #include "orders/csv/csv_order_importer.h"
@@ -186,16 +187,16 @@ bool CsvOrderImporter::IsOurs() const {
 // user says to go on: taken for the end of the file, it would cut an order short.
 bool CsvOrderImporter::ReadLine(Line& line) {
   bool read = false;
-  std::optional<LineTooLong> tooLong;
+  std::exception_ptr tooLong;
   const auto readOne = [&] {
     try {
       read = Lines().Read(line);
-    } catch (const LineTooLong& error) {
-      tooLong = error;
+    } catch (const LineTooLong&) {
+      tooLong = std::current_exception();
     }
   };
   if (!Try(readOne)) throw ErrorHandling::LeaveProcedure{};
-  if (tooLong) throw *tooLong;
+  if (tooLong) std::rethrow_exception(tooLong);
   return read;
 }
 

@@ -155,9 +155,8 @@ class X12OrderImporter::Sweep {
 
   void CleanUp(const X12Segment& segment, X12Walk::Event event) {
     const std::string_view text = segment.Text();
-    if (segment.Overlong()) {
-      WriteAll(segment);
-    } else if (segment.Begins("ISA")) {
+    if (segment.Overlong()) return WriteAll(segment);
+    if (segment.Begins("ISA")) {
       Hold(interchange_, text);
     } else if (event == X12Walk::Event::kGroupBegins || segment.Begins("GS*")) {
       Hold(group_, Marked(text));
