@@ -16,7 +16,7 @@ int main(int count, char** arguments) {
     std::fputs("usage: list CLASS WORKSPACE DOCUMENT FILE\n", stderr);
     return 2;
   }
-  const auto host = host::SqlHost::Open(std::string(arguments[2]) + "/partnerkit.db");
+  const auto host = host::SqlHost::Open(std::string(arguments[2]) + "/partnerkit.db", {.relativePaths = true});
   const auto importer = CreateTranslator(arguments[1], platform::DefaultPorts());
   ColumnTable columns;
   RowTable rows;

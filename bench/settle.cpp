@@ -57,7 +57,7 @@ class ForgetfulHost : public System, private RecordStore {
 };
 
 int Settle(bool all, const std::string& progId, const std::string& workspace, const std::string& file) {
-  const auto host = host::SqlHost::Open(workspace + "/partnerkit.db");
+  const auto host = host::SqlHost::Open(workspace + "/partnerkit.db", {.relativePaths = true});
   ForgetfulHost system(*host);
   const auto importer = CreateTranslator(progId, platform::DefaultPorts());
   ColumnTable columns;

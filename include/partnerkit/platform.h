@@ -5,8 +5,9 @@
 
 namespace partnerkit::platform {
 
-// Ports on POSIX files and the system's clock, with no error dialog (every fault leaves its procedure). The objects
-// live as long as the program.
+// Ports on POSIX files and the system's clock. The objects live as long as the program. There is no error dialog: a
+// fault leaves its procedure, and nothing tells of it. Set `errorOutlets.dialog` to learn of faults, and `tell` of what
+// happens to files.
 Ports DefaultPorts();
 
 }  // namespace partnerkit::platform

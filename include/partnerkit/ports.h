@@ -87,9 +87,11 @@ class Files {
   virtual std::unique_ptr<InputFile> OpenInput(const std::string& path, Share share) = 0;
   // Exclusive: an output file is never shared.
   virtual std::unique_ptr<OutputFile> OpenOutput(const std::string& path, OutputMode mode) = 0;
-  // A new, empty file beside `path`, held like any output, for what is to take the place of `path` by a rename. It has
-  // a name of its own, told in `name`, that no other program's file has; no link is followed. What a killed program
-  // left of an earlier draft of the same path is cleared away.
+  // A new, empty file in the folder of `path`, held like any output until it is closed, for what is to take the place
+  // of `path`. `name` gets the path to give to Rename, RenameNew or Delete. These must work while the draft is open:
+  // callers rename first and close then, for a draft that nobody holds counts as left by a killed program. Such a one
+  // of the same `path` is cleared away, one that is held never; several may be open at once, each under a name of its
+  // own. No link is followed. A draft that is let go stays until it is renamed or deleted.
   virtual std::unique_ptr<OutputFile> OpenDraft(const std::string& path, std::string& name) = 0;
   virtual void Delete(const std::string& path) = 0;
   // Gives `from` the name `to` in one step, in the place of a file that has it; durable when it returns.

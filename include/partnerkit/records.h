@@ -352,8 +352,10 @@ struct OrderLocnLine {
   std::int32_t OrderLineId() const { return LineId; }
 };
 
-// An order that was posted from a file which still holds it: a program that stops before the file is settled leaves the
-// record behind, so that the next one knows the order for its own work.
+// An order that was posted from a file which still holds it: there is one from the commit of a posting until `Term` has
+// settled the file. It stays behind a run that was stopped, cancelled or could not rewrite the file, so that the next
+// one knows the order for its own work, and goes at the next listing of that file by the same document definition once
+// the order is stored no longer or in the file no longer. A host neither writes these records nor has to remove them.
 struct UnsettledOrder {
   static const RecordType kType;
   static const Lookup kByFileName;  // of a document definition

@@ -27,7 +27,8 @@ class RecordStore {
   // Reads the record whose key (or, for a record without a key, whose id) is set. False when there is none; the record
   // is then unchanged.
   virtual bool Load(const RecordType& type, void* record) = 0;
-  // Stores a new record; one with an id gets it set. What was stored before a False stays as it is.
+  // Stores a new record; one with an id gets it set, to a number that no record of the type has had, not even one that
+  // was deleted: `UnsettledOrder` and the run log rely on it. What was stored before a False stays as it is.
   virtual bool Add(const RecordType& type, void* record) = 0;
   // Writes every member back, by id when the type has one, else by key. False when there is no such record.
   virtual bool Update(const RecordType& type, const void* record) = 0;
@@ -100,10 +101,11 @@ class System {
   virtual bool DeleteOrder(const Order& order) = 0;
   // Makes all that was stored since the last one durable. The argument is the host's; the library passes 0.
   virtual void Commit(std::int32_t mode) = 0;
-  // A transaction around one posting. What was stored before it is made durable first. Records of the run log (`Log`)
-  // are no part of it, nor of anything that the store takes back by itself: a host keeps what was added and writes it
-  // again, under the id that it had, for that id has been shown to others and must never be given to another record. A
-  // record that waits is found by its id, and no failure to write it fails a commit.
+  // A transaction, around the making of a notice and around its stamping; orders are posted without one, by `Commit`.
+  // Transactions don't nest, and there is no `Commit` within one. What was stored before it is made durable first.
+  // Records of the run log (`Log`) are no part of it, nor of anything that the store takes back by itself: a host keeps
+  // what was added and writes it again, under the id that it had, for that id has been shown to others and must never
+  // be given to another record. A record that waits is found by its id, and no failure to write it fails a commit.
   virtual void BeginTrans() = 0;
   virtual void CommitTrans() = 0;
   // Takes back all that was stored since BeginTrans but the log records.

@@ -36,8 +36,9 @@ class Translator {
   // A flag for the host; False after `Init` but on the reconciliation class. The translators never read it.
   bool PROCESSALL = false;
 
-  // Binds the translator to the host and to one document definition and hands out the column table. False, with a log
-  // record, when the run cannot start.
+  // Binds the translator to the host and to one document definition and hands out the column table. False when the run
+  // cannot start, with a log record or a fault on the error trail. An unknown definition is no reason: it lists
+  // nothing. `Load` and what follows need an `Init` that gave True.
   virtual bool Init(System& system, std::int16_t EDIDocId, ColumnTable& Columns) = 0;
   // Reads the input and fills the rows. Gives their number; 0 when there are none or the input could not be read, with
   // the reason on the log and `a_vtRows` untouched. An input file stays held until `Term` or `Cancel`.
@@ -50,7 +51,8 @@ class Translator {
   virtual bool Delete(std::int32_t a_lRowNum, ErrorList& vtErrorLog) = 0;
   // The normal end: settles the input file and closes everything.
   virtual bool Term() = 0;
-  // Abandons the run: closes the files, changes nothing.
+  // Abandons the run and closes the files. What was posted stays posted. A CSV file stays as it is; an X12 file is
+  // settled and marked as by `Term`, but for the partners that leave it be.
   virtual void Cancel() = 0;
   // A new log record with `LogId` set to that of the newest record this translator wrote, 0 when it wrote none.
   virtual LogRecord Log() const = 0;

@@ -18,6 +18,9 @@ constexpr std::size_t kDefaultWidth = 100;
 constexpr std::size_t kLeastWidth = 40;
 constexpr std::size_t kLeastLastColumn = 20;
 constexpr std::string_view kGap = "  ";
+// Of any column but the last, which is broken into lines; one odd value must not push the others off the screen.
+constexpr std::size_t kMostWidth = 60;
+constexpr std::string_view kCut = "...";
 
 // Byte position behind the first `columns` characters.
 std::size_t Behind(std::string_view utf8, std::size_t columns) {
@@ -27,6 +30,11 @@ std::size_t Behind(std::string_view utf8, std::size_t columns) {
     if (starts && columns-- == 0) break;
   }
   return at;
+}
+
+std::string Shortened(std::string text) {
+  if (Width(text) > kMostWidth) text.replace(Behind(text, kMostWidth - kCut.size()), std::string::npos, kCut);
+  return text;
 }
 
 // Cuts the first line of at most `width` columns off `rest`, between words where there are any.
@@ -72,7 +80,8 @@ void PrintTable(std::ostream& out, const std::vector<TableColumn>& columns, std:
   widths.reserve(columns.size());
   for (const TableColumn& column : columns) widths.push_back(Width(column.caption));
   for (std::size_t row = 0; row < rows; ++row) {
-    for (std::size_t i = 0; i <= last; ++i) widths[i] = std::max(widths[i], Width(cell(row, i)));
+    for (std::size_t i = 0; i < last; ++i) widths[i] = std::max(widths[i], Width(Shortened(cell(row, i))));
+    widths[last] = std::max(widths[last], Width(cell(row, last)));
   }
   std::size_t before = 0;
   for (std::size_t i = 0; i < last; ++i) before += widths[i] + kGap.size();
@@ -81,7 +90,7 @@ void PrintTable(std::ostream& out, const std::vector<TableColumn>& columns, std:
   const auto print = [&](const CellText& text, std::size_t row) {
     std::string line;
     for (std::size_t i = 0; i < last; ++i) {
-      Pad(line, text(row, i), widths[i], columns[i].right);
+      Pad(line, Shortened(text(row, i)), widths[i], columns[i].right);
       line += kGap;
     }
     const std::string lastText = text(row, last);

@@ -116,7 +116,8 @@ Segment SegmentReader::Give(std::size_t end) {
   Segment segment;
   segment.begin = Position();
   segment.text = {buffer_.data() + begin_, end - begin_};
-  segment.terminated = end < filled_ && buffer_[end] == syntax_.terminator;
+  segment.ended = end < filled_;
+  segment.terminated = segment.ended && buffer_[end] == syntax_.terminator;
   if (!segment.terminated && segment.text.find_first_not_of(' ') == std::string_view::npos) segment.text = {};
   segment.length = segment.text.size();
   GoBehind(end);
@@ -147,7 +148,8 @@ Segment SegmentReader::GiveOverlong() {
   end = std::min(end, filled_);
   segment.text = {front_.data(), front_.size()};
   segment.length = base_ + end + 1 - segment.begin;
-  segment.terminated = end < filled_ && buffer_[end] == syntax_.terminator;
+  segment.ended = end < filled_;
+  segment.terminated = segment.ended && buffer_[end] == syntax_.terminator;
   GoBehind(end);
   segment.end = Position();
   return segment;

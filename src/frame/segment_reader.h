@@ -24,6 +24,7 @@ struct Segment {
   std::uint64_t end = 1;     // where the next read begins: just behind what ended the segment
   std::uint64_t length = 0;  // in bytes, more than `text` has when the segment is overlong
   bool terminated = false;   // it has its terminator
+  bool ended = false;        // that, or a line end; else the file ends in it, and it may be half a segment
 
   // `text` holds the front of it only. Such a segment can be passed over and copied, not read.
   bool Overlong() const { return length > text.size(); }

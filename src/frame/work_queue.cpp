@@ -75,6 +75,7 @@ void WorkQueue::Rewrite::Begin() {
     out_.reset();
     files.Delete(draft_);
   }
+  readTo_ = queue_.File().Length();
   if (files.Exists(temporary_) && !MayStay(temporary_)) MoveAside(temporary_);
   out_ = files.OpenDraft(queue_.target_, draft_);
   if (!out_->TakeRights(queue_.File().Rights(), Take::kAll)) {
@@ -135,7 +136,18 @@ void WorkQueue::Rewrite::Replace() {
   } catch (const RunTimeError& error) {
     Fail(error, "replaced");
   }
-  if (out_) std::exchange(out_, nullptr)->Close();
+  if (!out_) return;
+  TakeLateBytes();
+  std::exchange(out_, nullptr)->Close();
+}
+
+// The old file has lost its name by now, and nobody else can find what was added to it.
+bool WorkQueue::Rewrite::TakeLateBytes() {
+  const std::uint64_t length = queue_.File().Length();
+  if (length <= readTo_) return false;
+  KeepRange({readTo_ + 1, length + 1});
+  out_->Sync();
+  return true;
 }
 
 void WorkQueue::Rewrite::Remove(bool withTemporary) {
@@ -143,6 +155,12 @@ void WorkQueue::Rewrite::Remove(bool withTemporary) {
     queue_.files_.Delete(queue_.target_);
   } catch (const RunTimeError& error) {
     Fail(error, "removed");
+  }
+  if (out_ && queue_.File().Length() > readTo_) {
+    out_->Truncate(0);
+    TakeLateBytes();
+    Leave(queue_.target_);
+    return;
   }
   // One that an earlier run left says as little.
   if (!withTemporary && !queue_.files_.Exists(temporary_)) {

@@ -108,7 +108,12 @@ class WorkQueue {
     void Keep(std::string_view bytes) { out_->Write(bytes); }
     // Nothing was kept so far.
     bool Empty() { return out_->Length() == 0; }
-    void Finish() { out_->Sync(); }
+    // What was read of the order file is so many bytes. A mailbox that appends to it later, while it is being replaced,
+    // finds its lines at the end of the new one.
+    void Finish(std::uint64_t readTo) {
+      readTo_ = readTo;
+      out_->Sync();
+    }
     // Fails when the order file is no longer the one held; what was kept is then beside it, under its name and ".kept",
     // or ".kept.1" and so on where that is taken.
     void Claim();
@@ -124,12 +129,14 @@ class WorkQueue {
     const std::string& Leave(const std::string& name);
     [[noreturn]] void Fail(const RunTimeError& cause, const std::string& what);
     bool MayStay(const std::string& path);
+    bool TakeLateBytes();
 
     WorkQueue& queue_;
     Tell tell_;
     std::string temporary_;
     std::string draft_;
     std::unique_ptr<OutputFile> out_;
+    std::uint64_t readTo_ = 0;
   };
 
  private:

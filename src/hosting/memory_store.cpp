@@ -24,7 +24,8 @@ struct MemoryStore::Parts {
 
   void Replace(MemoryTable& table, Place place, Row row) {
     Row before = table.Replace(place, std::move(row));
-    if (noting) changes.push_back({&table, place, std::move(before)});
+    // The run log is no part of a transaction.
+    if (noting && &table != &TableOf(Log::kType)) changes.push_back({&table, place, std::move(before)});
   }
 
   std::unordered_map<const Member*, MemoryTable> tables;

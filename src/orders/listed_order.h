@@ -23,6 +23,7 @@ struct ListedOrder {
   std::int64_t line = 0;     // number of that line, from 1; 0 in files that aren't read by lines
   std::string fault;         // why the transaction cannot be read; empty when it can
   std::int32_t OrderId = 0;  // of the stored order; 0 when it isn't stored or was turned away
+  bool waits = false;        // for an earlier order of its number, which it cancels or changes
   bool done = false;         // nothing is left to do about it: its transaction leaves the file
 
   // The control numbers joined, as transactions are told apart.

@@ -1,6 +1,7 @@
 #include "orders/order_importer.h"
 
 #include <algorithm>
+#include <numeric>
 
 #include "frame/numbers.h"
 #include "orders/order_columns.h"
@@ -49,6 +50,17 @@ std::int32_t OrderImporter::ShowRows(RowTable& rows) {
     rows.At(row, 3) = std::string();
   }
   return static_cast<std::int32_t>(listed_.size());
+}
+
+std::span<const std::uint32_t> OrderImporter::RowsOfNumber(std::string_view PONo) {
+  const auto number = [this](std::uint32_t row) { return std::string_view(listed_[row].PONo); };
+  if (rowsByNumber_.size() != listed_.size()) {
+    rowsByNumber_.resize(listed_.size());
+    std::iota(rowsByNumber_.begin(), rowsByNumber_.end(), 0U);
+    std::ranges::stable_sort(rowsByNumber_, {}, number);
+  }
+  return {std::ranges::lower_bound(rowsByNumber_, PONo, {}, number),
+          std::ranges::upper_bound(rowsByNumber_, PONo, {}, number)};
 }
 
 ListedOrder* OrderImporter::EntryOfRow(std::int32_t row) {
@@ -179,8 +191,9 @@ OrderImporter::Next OrderImporter::SettleStoredOrder(OrderPosting& posting, Orde
   // The same transaction again. One that an earlier run left half stored is no order yet: it is replaced, for turned
   // away it would be neither in the store nor in the file. One stored with its faults looks like it, and is an order.
   if (SameTransaction(stored, posting.entry)) {
-    if (IsStoredEarlier(posting, stored)) return Next::kEnd;
-    if (facts.incomplete && !posting.checks.FaultsPass()) {
+    const bool half = facts.incomplete && !posting.checks.FaultsPass();
+    if (!half && IsStoredEarlier(posting, stored)) return Next::kEnd;
+    if (half) {
       return CarryOut(posting, {.number = kWarning, .message = words::kIncomplete, .fate = Fate::kReplace}, facts,
                       stored);
     }
@@ -297,8 +310,8 @@ OrderImporter::Next OrderImporter::RefuseNewOrder(OrderPosting& posting, const O
     if (rule->fate == Fate::kTurnAway || rule->fate == Fate::kCancel) {
       // A cancellation must not overtake its order, which a later run may store.
       const bool refersToAnother = !rule->purpose.empty() || !rule->response.empty();
-      const bool waits = refersToAnother && !posting.deletedStored && EarlierStays(posting.entry);
-      return waits ? Next::kEnd : TurnAway(posting);
+      posting.entry.waits = refersToAnother && !posting.deletedStored && EarlierStays(posting.entry);
+      return posting.entry.waits ? Next::kEnd : TurnAway(posting);
     }
     if (rule->fate != Fate::kGoOn) return Next::kEnd;
     rules = rules.subspan(static_cast<std::size_t>(rule - rules.data()) + 1);

@@ -55,6 +55,10 @@ class OrderImporter : public TranslatorBase {
   bool HoldOrderFile(const std::string& path);
   // The grid of what was listed, and the number of its rows; 0, with a word on the log, when nothing was.
   std::int32_t ShowRows(RowTable& rows);
+  // The rows of that order number, in their order. They are looked up only when asked for: few files need it.
+  std::span<const std::uint32_t> RowsOfNumber(std::string_view PONo);
+  // Behind every listing.
+  void ForgetRows() { rowsByNumber_.clear(); }
   // Null, with the error told, for a row that the list doesn't have.
   ListedOrder* EntryOfRow(std::int32_t row);
   // False, with the error told, when the file is too short for the entry.
@@ -145,6 +149,8 @@ class OrderImporter : public TranslatorBase {
   std::set<std::int32_t> unsettled_;  // orders of this file whose records ForgetUnsettled drops
 
  private:
+  std::vector<std::uint32_t> rowsByNumber_;
+
   bool IsStoredEarlier(OrderPosting& posting, const Order& stored);
   UnsettledOrder NoteOf(std::int32_t orderId);
   Next CarryOut(OrderPosting& posting, const OrderRule& rule, const OrderFacts& facts, Order& stored);

@@ -90,8 +90,9 @@ bool MakeDurable(TranslatorBase& translator, OrderDraft& draft, bool complete, U
       throw RunTimeError(run_time::kDatabase, "PO " + draft.header.PONo + " cannot be noted as not settled");
     }
   };
-  if (complete && !translator.Try(markComplete)) return false;
+  // In this order: a complete order without the note would reach neither the file's next run nor the backup.
   if (!translator.Try(noteUnsettled)) return false;
+  if (complete && !translator.Try(markComplete)) return false;
   return translator.Try([&] { translator.Host().Commit(0); });
 }
 

@@ -65,6 +65,17 @@ TEST(Json, PutsEachRowOnALineAndClosesWhatIsOpen) {
       "}\n");
 }
 
+TEST(Table, ShortensWhatWouldPushTheOthersAway) {
+  std::ostringstream out;
+  PrintTable(
+      out, {{"PO Number"}, {"Result"}}, 1,
+      [](std::size_t, std::size_t column) {
+        return column == 0 ? "\u20ac" + std::string(70, '7') : std::string("posted");
+      },
+      100);
+  EXPECT_THAT(out.str(), ::testing::HasSubstr("\n\u20ac" + std::string(56, '7') + "...  posted\n"));
+}
+
 TEST(Table, BreaksTheLastColumnBetweenWords) {
   std::ostringstream out;
   const std::vector<std::vector<std::string>> rows = {{"7", "eins", "a message that is much too long for it"},

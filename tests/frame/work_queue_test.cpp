@@ -45,7 +45,7 @@ class WorkQueueTest : public ::testing::Test {
     for (Line line; lines.Read(line);) {
       if (!line.text.starts_with("-")) rewrite.Keep(line.raw);
     }
-    rewrite.Finish();
+    rewrite.Finish(queue_.File().Length());
     finish(rewrite);
   }
 
@@ -125,6 +125,22 @@ TEST_F(WorkQueueTest, MovesFilesOfOthersAsideAndDeletesNone) {
     });
     EXPECT_EQ(Files(), c.files);
     EXPECT_THAT(told_, SizeIs(c.told));
+    queue_.Close();
+  }
+}
+
+// A mailbox that holds the file open, or opens it in the last moment, has its lines behind what stays.
+TEST_F(WorkQueueTest, KeepsWhatIsAppendedWhileTheFileIsReplaced) {
+  for (const bool nothingStays : {false, true}) {
+    Open(nothingStays ? "-b\n" : "a\n-b\n");
+    std::ofstream mailbox(folder_ / "orders.txt", std::ios::app);
+    Deal([&](WorkQueue::Rewrite& rewrite) {
+      rewrite.Claim();
+      mailbox << "late\n" << std::flush;
+      if (nothingStays) rewrite.Remove(true);
+      else rewrite.Replace();
+    });
+    EXPECT_THAT(Files(), ElementsAre(nothingStays ? "orders.txt=late\n" : "orders.txt=a\nlate\n"));
     queue_.Close();
   }
 }

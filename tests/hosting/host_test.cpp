@@ -232,24 +232,25 @@ TEST(MemoryHostTest, TellsWhyItRefuses) {
 
 TEST(MemoryHostTest, WalksAroundWhatChangesMeanwhileAndGivesNoIdTwice) {
   MemoryHost host;
-  Log first, second, third, late;
+  Order first, second, third, late;
+  first.PONo = "1", second.PONo = "2", third.PONo = "3";
   host.BeginTrans();
   EXPECT_TRUE(Add(host.Records(), late));
   host.RollbackTrans();
   EXPECT_TRUE(Add(host.Records(), first) && Add(host.Records(), second) && Add(host.Records(), third));
-  std::vector<Log> seen;
+  std::vector<Order> seen;
   seen.reserve(4);
-  host.Records().Select(Log::kType, kEveryRecord, &first, [&]() -> void* {
+  host.Records().Select(Order::kType, kEveryRecord, &first, [&]() -> void* {
     if (seen.empty()) {
-      late.LogId = 0;
+      late.OrderId = 0;
       EXPECT_TRUE(Delete(host.Records(), second) && Add(host.Records(), late));
     }
     return &seen.emplace_back();
   });
   std::string ids;
-  for (const Log& log : seen) ids += std::to_string(log.LogId) + " ";
+  for (const Order& order : seen) ids += std::to_string(order.OrderId) + " ";
   EXPECT_EQ(ids, "2 4 ");
-  EXPECT_EQ(late.LogId, 5);
+  EXPECT_EQ(late.OrderId, 5);
 }
 
 // An order that its store gives up in part only.

@@ -210,8 +210,15 @@ TEST(CsvOddFilesTest, HoldsAnOrderWhoseLastLineIsCutShort) {
        {},
        "line 2: the last line of the file orders.txt stops before it says which order it is of"},
       {"of another order, before the addresses", "1,2,34,P,C,450002,5,9\r\n1,2,35,", {"450002/0"}, ""},
-      {"behind it", "1,2,34,P,C,450002,5,9", {"450002/0"}, ""},
-      {"behind it, with less than the map", "1,2,34,P,C,450002,5", {"450002/0"}, ""},
+      {"behind it, with less than the map",
+       "1,2,34,P,C,450002,5",
+       {},
+       "line 1: the last line of the file orders.txt stops before all its columns"},
+      {"behind it, as the line before it", "1,2,34,P,OTHERS,450002,5\r\n1,2,34,P,C,450002,5", {"450002/0"}, ""},
+      {"behind it, with less than the line before it",
+       "1,2,34,P,C,450002,5,9\r\n1,2,34,P,C,450002,5",
+       {},
+       "line 2: the last line of the file orders.txt stops before all its columns"},
   };
   for (const auto& c : cases) {
     SCOPED_TRACE(c.what);
@@ -241,6 +248,45 @@ TEST(CsvOddFilesTest, HoldsAnOrderWhoseLastLineIsCutShort) {
       EXPECT_THAT(run.log.front(), HasSubstr("stops before its EDI addresses, at the end of the file"));
       EXPECT_EQ(trade.Orders(), "1,2,35,");
     }
+  }
+}
+
+// What can't be told apart isn't posted in part.
+TEST(CsvOddFilesTest, HoldsTransactionsThatContradictThemselves) {
+  const std::string second = "SEQUENTIALLINENO=8; INCOMINGPRODUCTNO=93002";
+  const std::string first = OddFiles().Line(), rest = OddFiles().Line(second);
+  const struct {
+    std::string what, orders;
+    std::size_t rows;
+    Texts stored;
+    std::string told;
+  } cases[] = {
+      {"another number inside",
+       first + OddFiles().Line(second + "; PONUMBER=450009"),
+       1,
+       {},
+       "line 2: it has the order number 450009, but stands in the transaction of another"},
+      {"the first line twice", first + first + rest, 2, {}, "line 2: the transaction stands in the file "},
+      {"cut short the second time", first + rest + first, 2, {}, "line 3: the transaction stands in the file "},
+      {"lines behind another order",
+       first + OddFiles().Line(kOtherOrder) + rest,
+       3,
+       {"450002/0"},
+       "line 3: the transaction stands in the file "},
+      {"the same twice", first + rest + first + rest, 2, {"450001/0"}, ""},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.what);
+    OddFiles trade;
+    const auto run = trade.Import(c.orders);
+    ASSERT_THAT(run.outcomes, SizeIs(c.rows));
+    EXPECT_EQ(trade.StoredOrders(), c.stored);
+    if (c.told.empty()) continue;
+    for (const std::size_t row : {std::size_t{0}, c.rows - 1}) {
+      EXPECT_THAT(run.outcomes[row].told,
+                  ElementsAre(HasSubstr("...Cannot process PO 450001, " + c.told), kIncomplete));
+    }
+    EXPECT_THAT(trade.Orders(), HasSubstr(first));
   }
 }
 

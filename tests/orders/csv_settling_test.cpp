@@ -281,13 +281,16 @@ TEST(CsvSettlingTest, SettlesTheFileByItsOwnKey) {
   }
 }
 
-TEST(CsvSettlingTest, EndsACompanysOrderAtAnothersLine) {
-  const std::string second = "SEQUENTIALLINENO=8; INCOMINGPRODUCTNO=93002; COMPANYEDIADDR=OTHERS";
-  for (const auto& [className, records] : {std::pair(std::string(kCml), 4U), std::pair(std::string(kBulk), 4U),
-                                           std::pair(std::string(kColes), 6U), std::pair(std::string(kGhpl), 6U)}) {
+TEST(CsvSettlingTest, LeavesAnotherCompanysLineOutOfAnOrder) {
+  const std::string second = "SEQUENTIALLINENO=8; INCOMINGPRODUCTNO=93002";
+  for (const std::string className : kAllClasses) {
+    SCOPED_TRACE(className);
     Siblings trade(className);
-    trade.Import(trade.Line(kTraded) + trade.Line(kTraded + second));
-    EXPECT_THAT(trade.StoredRecords(), SizeIs(records)) << className;
+    const std::string other = trade.Line(kTraded + second + "; COMPANYEDIADDR=OTHERS"), junk = "junk\r\n";
+    const std::string last = trade.Line(kTraded + "SEQUENTIALLINENO=9; INCOMINGPRODUCTNO=93003");
+    trade.Import(trade.Line(kTraded).append(other).append(junk).append(last));
+    EXPECT_THAT(trade.StoredRecords(), SizeIs(6));
+    EXPECT_EQ(trade.Orders(), other + junk);
   }
 }
 

@@ -179,9 +179,16 @@ TEST(X12ListingTest, ArchivesTheFileAsItCame) {
     }
     std::filesystem::remove_all(trade.folder / "archive");
     trade.folder.Write("archive", "no folder");
+    Texts told;
+    trade.ports.tell = [&](Told, const std::string& sentence) { told.push_back(sentence); };
     EXPECT_EQ(trade.Import(trade.Sent(trade.File(trade.Body("450003")))).rows, 1);
     EXPECT_THAT(trade.NewLog(), ElementsAre("0 Process: PO 450003 import completed."));
     EXPECT_THAT(trade.reports, IsEmpty());
+    if (className == kGhpl) {
+      EXPECT_THAT(told, IsEmpty());
+    } else {
+      EXPECT_THAT(told, ElementsAre(::testing::HasSubstr(" is not archived: ")));
+    }
   }
 }
 

@@ -124,6 +124,14 @@ TEST(X12OddFilesTest, LetsNoCancellationOvertakeItsOrder) {
   EXPECT_GT(run.outcomes[0].result, 0);
   EXPECT_THAT(run.outcomes[1].told, ElementsAre("W Process: ... Warning Purchase Order Cancel Request 450001."));
   EXPECT_THAT(trade.StoredOrders(), IsEmpty());
+  // One that waits is over once the order is sent anew behind it.
+  trade.Import(Interchange(Group(TransactionSet(trade.Body("450001", "0888")) + TransactionSet(cancel, "0002", "860") +
+                                 TransactionSet(trade.Body(), "0003"))));
+  EXPECT_THAT(trade.StoredOrders(), ElementsAre("450001/0"));
+  trade.Import();
+  EXPECT_THAT(trade.StoredOrders(), ElementsAre("450001/0"));
+  EXPECT_FALSE(trade.folder.Has(X12Trade::kFile));
+  trade.Sql("DELETE FROM tbOrder");
   // With nothing before it, a cancellation of nothing leaves, as does one in front of its order.
   trade.Import(
       Interchange(Group(TransactionSet(cancel, "0002", "860") + TransactionSet(trade.Body("450001", "0888")))));
@@ -167,6 +175,48 @@ TEST(X12OddFilesTest, ReadsFilesWithAByteOrderMarkOrCtrlZ) {
     run = trade.Import();
     EXPECT_EQ(run.rows, 1);
     EXPECT_FALSE(trade.folder.Has(X12Trade::kFile));
+  }
+}
+
+// A mailbox that writes slowly: whatever a run makes of the first part, the orders of the whole file come to the store.
+TEST(X12OddFilesTest, WaitsForTheRestOfAnUpload) {
+  for (const std::string& className : kAllClasses) {
+    for (const bool posts : {false, true}) {
+      X12Trade trade(className);
+      trade.system->Commit(0);
+      trade.Sql("PRAGMA synchronous=OFF");
+      trade.document.AckFolder = Text();
+      const std::string file =
+          trade.Sent(Interchange(Group(TransactionSet(Replaced(trade.Body(), "CTT", "SDQ*EA*92*0512*12*0513*12~CTT")) +
+                                       TransactionSet(trade.Body("450002"), "0002"))));
+      const auto quantities = [&] {
+        std::string all;
+        for (const std::string& line : trade.Every<OrderLocnLine>()) all += line.substr(line.find("BuyingLocn")) + "\n";
+        return all;
+      };
+      trade.Import(file);
+      const std::string whole = quantities();
+      EXPECT_THAT(whole, HasSubstr("Quantity=12 "));
+      for (std::size_t cut = 1; cut < file.size(); cut += className == kKmart ? 1 : 5) {
+        for (const char* table : {"Order", "OrderLine", "OrderLocn", "OrderLocnLine", "Log", "UnsettledOrder"}) {
+          trade.Sql("DELETE FROM tb" + std::string(table));
+        }
+        std::filesystem::remove(trade.OrdersPath());
+        trade.WriteOrders(file.substr(0, cut));
+        if (posts) {
+          trade.Import();
+        } else {
+          const auto importer = trade.Start();
+          RowTable rows;
+          importer->Load(trade.OrdersPath(), rows);
+          importer->Cancel();
+        }
+        std::ofstream(trade.OrdersPath(), std::ios::app | std::ios::binary) << file.substr(cut);
+        trade.Import();
+        EXPECT_EQ(quantities(), whole) << className << " cut behind " << cut << ": " << file.substr(0, cut);
+        if (::testing::Test::HasFailure()) return;
+      }
+    }
   }
 }
 

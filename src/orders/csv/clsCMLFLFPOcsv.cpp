@@ -20,7 +20,6 @@ constexpr CsvOrderValues kValues{
     .optional = kOptional,
     .orderKey = kNumberFields,
     .nullControls = true,
-    .endsAtOtherCompany = true,
     .posting = kGtinPosting,
     .keepsTurnedAway = true,
 };

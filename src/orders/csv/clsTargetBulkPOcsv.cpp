@@ -28,7 +28,6 @@ constexpr CsvOrderValues kValues{
     .added = kAdded,
     .removed = kGtinRemoved,
     .nullControls = true,
-    .endsAtOtherCompany = true,
     .posting = BulkPosting(),
     .keepsTurnedAway = true,
 };

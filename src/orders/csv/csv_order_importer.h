@@ -7,6 +7,7 @@
 
 #include <string>
 #include <string_view>
+#include <unordered_map>
 #include <vector>
 
 #include "frame/field_map.h"
@@ -37,12 +38,11 @@ class CsvOrderImporter : public OrderImporter {
 
     const PostingValues& values;
     std::string firstLineKey;
-    std::string lineSequence;      // of the line last read
-    std::int64_t lineNo = 0;       // its number in the file
-    std::size_t fields = 0;        // that it has, and
-    std::size_t fieldsBefore = 0;  // the line before it in the order
-    bool ended = true;             // it has its end
-    bool listed = true;            // it was there, whole, when the file was listed
+    std::string lineSequence;  // of the line last read
+    std::int64_t lineNo = 0;   // its number in the file
+    std::size_t fields = 0;    // that it has
+    bool ended = true;         // it has its end
+    bool listed = true;        // it was there, whole, when the file was listed
   };
 
   // The line's product: the number it is ordered by, and the product that stands for.
@@ -100,6 +100,7 @@ class CsvOrderImporter : public OrderImporter {
   bool SetOrderList(const std::string& path);
   bool ListTransactions();
   void ListLines(std::int64_t& lineNo);
+  std::size_t FieldsAt(std::uint64_t position);
   void WarnOfCutLine(const Line& line, std::int64_t lineNo);
   bool IsOurs() const;
   void JoinLineKey(std::string& key) const;
@@ -126,6 +127,10 @@ class CsvOrderImporter : public OrderImporter {
   void NeedListedOrder(const Posting& posting) const;
   void NeedWholeLine(const Posting& posting) const;
   void NeedControls(const Posting& posting) const;
+  void NeedOwnNumber(const Posting& posting) const;
+  void NeedOneText(const ListedOrder& entry);
+  std::string DigestOf(const ListedOrder& entry);
+  bool NextOwnLine(Posting& posting, std::string& key);
   Next PostLines(Posting& posting);
   OrderFacts Facts(const Posting& posting) const;
   Next ReadLines(Posting& posting);
@@ -140,7 +145,10 @@ class CsvOrderImporter : public OrderImporter {
   bool mapLoaded_ = false;
   CsvOrderLine line_;
   std::optional<LineReader> lines_;
-  std::uint64_t listedTo_ = 1;  // where the file ended when it was listed, from 1
+  std::uint64_t listedTo_ = 1;     // where the file ended when it was listed, from 1
+  std::size_t lastLineNeeds_ = 0;  // fields that a last line without an end has to have
+  // Of transactions that stand in the file more than once: where one has other lines than the one before it, or null.
+  std::unordered_map<std::string, const ListedOrder*> twins_;
   Posting* posting_ = nullptr;  // the call in hand
   BackupFile backup_;
   ProcessedOrders processed_;

@@ -1,6 +1,7 @@
 // Listing a CSV order file: from the map and the file to the rows.
 #include <algorithm>
 #include <exception>
+#include <utility>
 
 #include "frame/dates.h"
 #include "orders/csv/csv_order_importer.h"
@@ -108,6 +109,8 @@ bool CsvOrderImporter::ExpectFields() {
 bool CsvOrderImporter::SetOrderList(const std::string& path) {
   return Procedure("Function SetOrderList", false, [&](bool& listed) {
     listed_.clear();
+    twins_.clear();
+    ForgetRows();
     if (!FindOrderFile(path) || !HoldOrderFile(path)) return;
     lines_.emplace(queue_.File());
     if (!ListTransactions()) return;
@@ -129,7 +132,6 @@ bool CsvOrderImporter::ListTransactions() {
         "Line " + std::to_string(lineNo + 1) + " of " + fileName_ + " is longer than 64 MB, as no order's line is.");
     return false;
   }
-  listedTo_ = lines_->Position();
   return true;
 }
 
@@ -137,8 +139,12 @@ void CsvOrderImporter::ListLines(std::int64_t& lineNo) {
   const std::size_t columns = std::max(
       {line_.ColumnsFor(kListingFields), line_.ColumnsFor(values_.lineKey), line_.ColumnsFor(values_.orderKey)});
   std::string lastTransaction, firstLine, transaction, lineKey, number;
+  std::uint64_t before = 0, last = 0;
+  bool ended = true;
   for (Line line; ReadLine(line);) {
     ++lineNo;
+    before = std::exchange(last, line.position);
+    ended = line.ended;
     if (values_.skipsBlankLines && TrimBlanks(line.text).empty()) continue;
     line_.Read(line.text, columns);
     if (!line.ended) WarnOfCutLine(line, lineNo);
@@ -158,6 +164,16 @@ void CsvOrderImporter::ListLines(std::int64_t& lineNo) {
     lastTransaction = transaction;
     firstLine = lineKey;
   }
+  listedTo_ = lines_->Position();
+  // A file of one line is held against its map.
+  if (ended) lastLineNeeds_ = 0;
+  else lastLineNeeds_ = before == 0 ? line_.ColumnsFor(ExpectedFields(values_)) : FieldsAt(before);
+}
+
+std::size_t CsvOrderImporter::FieldsAt(std::uint64_t position) {
+  Line line;
+  lines_->Seek(position);
+  return ReadLine(line) ? CountFields(line.text) : 0;
 }
 
 // Nobody can tell yet whose line it is.

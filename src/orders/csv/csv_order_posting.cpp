@@ -86,9 +86,11 @@ CsvOrderImporter::Next CsvOrderImporter::PostLines(Posting& posting) {
 
 // Finds the transaction's first line.
 CsvOrderImporter::Next CsvOrderImporter::StartPosting(Posting& posting) {
+  NeedOneText(posting.entry);
   posting.lineNo = posting.entry.line - 1;
   if (!SeekTo(posting.entry) || !NextLine(posting)) return Next::kEnd;
   NeedListedOrder(posting);
+  NeedWholeLine(posting);
   WarnOfNoNumber(posting, LineText(posting.lineNo));
   return Next::kGoOn;
 }
@@ -104,26 +106,77 @@ void CsvOrderImporter::NeedListedOrder(const Posting& posting) const {
 
 // A last line that stops short is an upload that isn't finished: its quantity, or a part of it, is still to come.
 void CsvOrderImporter::NeedWholeLine(const Posting& posting) const {
+  const std::string where = LineText(posting.lineNo) + ": ";
   if (!posting.listed) {
-    throw Unreadable{LineText(posting.lineNo) + ": the file " + fileName_ +
-                     " has grown by this line of the order since it was listed"};
+    throw Unreadable{where + "the file " + fileName_ + " has grown by this line of the order since it was listed"};
   }
   if (posting.ended) return;
   const OrderField quantity[] = {posting.values.quantity};
   const std::size_t needed = line_.ColumnsFor(quantity);
-  if (posting.fields > needed ||
-      (posting.fields == needed && !line_[quantity[0]].empty() && posting.fields >= posting.fieldsBefore)) {
-    return;
-  }
-  throw Unreadable{LineText(posting.lineNo) + ": the last line of the file " + fileName_ + " stops before the end of " +
-                   std::string(Name(quantity[0])) + " and has no line end: an upload that isn't finished"};
+  const bool hasQuantity = posting.fields > needed || (posting.fields == needed && !line_[quantity[0]].empty());
+  if (hasQuantity && posting.fields >= lastLineNeeds_) return;
+  const std::string before = hasQuantity ? "all its columns" : "the end of " + std::string(Name(quantity[0]));
+  throw Unreadable{where + "the last line of the file " + fileName_ + " stops before " + before +
+                   " and has no line end: an upload that isn't finished"};
 }
 
-// The same, of a line that stops before it says which order it is of: it may be this one.
+// The same, of a line that stops before it says whose it is: it may be of this order.
 void CsvOrderImporter::NeedControls(const Posting& posting) const {
-  if (posting.ended || posting.fields > line_.ColumnsFor(values_.transactionKey)) return;
+  if (posting.ended || posting.fields > line_.ColumnsFor(kAddresses)) return;
+  std::string key;
+  line_.Join(values_.transactionKey, key);
+  if (posting.fields > line_.ColumnsFor(values_.transactionKey) && key != posting.entry.Controls()) return;
   throw Unreadable{LineText(posting.lineNo) + ": the last line of the file " + fileName_ +
                    " stops before it says which order it is of, and has no line end: an upload that isn't finished"};
+}
+
+// Lines leave the file by their order number, so that a line of another number would stay, and be posted again.
+void CsvOrderImporter::NeedOwnNumber(const Posting& posting) const {
+  std::string number;
+  const std::string_view own = OrderNumber(number);
+  if (own == posting.entry.PONo) return;
+  throw Unreadable{LineText(posting.lineNo) + ": it has the order number " + std::string(own) +
+                   ", but stands in the transaction of another"};
+}
+
+// A transaction that stands in the file twice, with other lines the second time: nobody can tell which are right.
+void CsvOrderImporter::NeedOneText(const ListedOrder& entry) {
+  const auto rows = RowsOfNumber(entry.PONo);
+  if (rows.size() < 2) return;
+  const auto [known, isNew] = twins_.try_emplace(entry.PONo + '\0' + entry.Controls(), nullptr);
+  if (isNew) {
+    std::optional<std::string> text;
+    for (const std::uint32_t row : rows) {
+      const ListedOrder& twin = listed_[row];
+      if (twin.Controls() != entry.Controls()) continue;
+      const std::string own = DigestOf(twin);
+      if (text && *text != own) known->second = &twin;
+      text = own;
+    }
+  }
+  if (known->second == nullptr) return;
+  throw Unreadable{LineText(known->second->line) + ": the transaction stands in the file " + fileName_ +
+                   " more than once, not with the same lines"};
+}
+
+// How many lines the transaction has, and a number made of what the map names of them.
+std::string CsvOrderImporter::DigestOf(const ListedOrder& entry) {
+  std::size_t lines = 0, digest = 0;
+  std::string controls, key, firstKey;
+  if (!SeekTo(entry)) return {};
+  for (Line line; ReadLine(line);) {
+    line_.Read(line.text);
+    if (!IsOurs()) continue;
+    line_.Join(values_.transactionKey, controls);
+    JoinLineKey(key);
+    if (lines == 0) firstKey = key;
+    else if (controls != entry.Controls() || key == firstKey) break;
+    ++lines;
+    for (std::size_t field = 0; field < kOrderFields; ++field) {
+      digest = digest * 31 + std::hash<std::string_view>{}(line_[static_cast<OrderField>(field)]);
+    }
+  }
+  return std::to_string(lines) + ' ' + std::to_string(digest);
 }
 
 bool CsvOrderImporter::SeekTo(const ListedOrder& entry) {
@@ -180,15 +233,22 @@ void CsvOrderImporter::FillHeader(Posting& posting) {
 CsvOrderImporter::Next CsvOrderImporter::ReadLines(Posting& posting) {
   JoinLineKey(posting.firstLineKey);
   std::string key;
-  for (;;) {
+  do {
     NeedWholeLine(posting);
+    NeedOwnNumber(posting);
     if (LineCounts() && TakeLine(posting) == Next::kEnd) return Next::kEnd;
-    posting.fieldsBefore = posting.fields;
-    if (!NextLine(posting)) return Next::kGoOn;
-    if (EndsTransaction(posting, key)) break;
-  }
-  NeedControls(posting);
+  } while (NextOwnLine(posting, key));
   return Next::kGoOn;
+}
+
+// Takes the transaction's next line in hand. Lines that aren't ours, another company's or no order's at all, may stand
+// between; they stay in the file, and so are no part of the order.
+bool CsvOrderImporter::NextOwnLine(Posting& posting, std::string& key) {
+  while (NextLine(posting)) {
+    NeedControls(posting);
+    if (IsOurs()) return !EndsTransaction(posting, key);
+  }
+  return false;
 }
 
 // Takes the next line in hand. False at the end of the file. A blank line inside an order doesn't end it: what stands
@@ -210,7 +270,6 @@ bool CsvOrderImporter::NextLine(Posting& posting) {
 bool CsvOrderImporter::EndsTransaction(const Posting& posting, std::string& key) const {
   line_.Join(values_.transactionKey, key);
   if (key != posting.entry.Controls()) return true;
-  if (values_.endsAtOtherCompany && line_[COMPANYEDIADDR] != Str(Document().CompanyEDIAddr)) return true;
   JoinLineKey(key);
   return key == posting.firstLineKey;
 }

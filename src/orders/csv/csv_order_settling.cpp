@@ -78,12 +78,12 @@ void CsvOrderImporter::DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRang
         Extend(posted, line);
       }
     }
-    rewrite.Finish();
+    rewrite.Finish(length);
   } while (queue_.File().Length() > length);
   // The Ctrl-Z that the file ends with.
   if (rewrite.Empty()) return;
   rewrite.KeepRange({lines.Position(), length + 1});
-  rewrite.Finish();
+  rewrite.Finish(length);
 }
 
 // A byte order mark stays in front of whatever stays.
@@ -159,8 +159,9 @@ void CsvOrderImporter::CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t beg
     const bool goes = envelope ? values_.deletesEnvelopes : nobodys || IsOurs();
     if (!inside || !goes) Keep(rewrite, line.raw);
   }
-  if (!rewrite.Empty()) rewrite.KeepRange({lines.Position(), queue_.File().Length() + 1});
-  rewrite.Finish();
+  const std::uint64_t length = queue_.File().Length();
+  if (!rewrite.Empty()) rewrite.KeepRange({lines.Position(), length + 1});
+  rewrite.Finish(length);
 }
 
 void CsvOrderImporter::Cancel() {

@@ -110,7 +110,6 @@ struct CsvOrderValues {
   bool skipsBlankLines = false;      // they leave the file, too
   bool nullControls = false;         // empty control numbers are stored as null
   bool importsProducts = false;      // a product file of the supplier is read at the end of listing
-  bool endsAtOtherCompany = false;   // a line for another company ends the transaction
 
   PostingValues posting = {};
 

@@ -10,8 +10,6 @@
 #include <optional>
 #include <string>
 #include <string_view>
-#include <unordered_map>
-#include <vector>
 
 #include "frame/segment_reader.h"
 #include "orders/order_importer.h"
@@ -93,13 +91,14 @@ class X12OrderImporter : public OrderImporter {
   Unreadable Fault(const RunTimeError& error) const;
   // Takes the file's next segment in hand. False at its end. Raises RunTimeError.
   bool ReadSegment();
+  bool EndsInterchange(std::string_view text) const;
   SegmentReader& Segments();
   void CloseOrderFile();
   X12Walk Walk() const;
 
   bool SameTransaction(const Order& stored, const ListedOrder& entry) const override;
   void MarkTurnedAway(ListedOrder& entry) override { entry.done = true; }
-  void MarkPosted(ListedOrder& entry) override { entry.done = true; }
+  void MarkPosted(ListedOrder& entry) override;
   void Export(OrderPosting& posting) override;
   bool EarlierStays(const ListedOrder& entry) override;
 
@@ -130,7 +129,6 @@ class X12OrderImporter : public OrderImporter {
   std::optional<SegmentReader> segments_;
   std::string interchangeCtl_;    // of the envelope in hand while listing
   std::string interchangeFault_;  // why its header cannot be read; empty when it can
-  std::unordered_map<std::string, std::vector<std::size_t>> sameNumber_;  // rows by order number, made when asked for
   bool listedWhole_ = false;
   std::uint64_t listedTo_ = 1;  // the file's end when it was listed, from 1
 };

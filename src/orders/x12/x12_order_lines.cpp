@@ -25,6 +25,9 @@ X12OrderImporter::Next X12OrderImporter::TakeLine(Posting& posting, const LineEl
   if (posting.draft.lines.Find(number)) {
     throw Unreadable{SegmentText() + ": product " + number + " stands in two lines of the order"};
   }
+  if (TrimBlanks(number).empty()) {
+    posting.log.Note(kWarning, "PO " + posting.entry.PONo + ", " + SegmentText() + ": the line has no product number.");
+  }
   posting.draft.lines.Add(line, number);
   posting.line = line;
   posting.distributed = false;

@@ -57,7 +57,7 @@ std::int32_t X12OrderImporter::Load(const std::string& a_sFileName, RowTable& a_
 bool X12OrderImporter::SetOrderList(const std::string& path) {
   return Procedure("Function SetOrderList", false, [&](bool& listed) {
     listed_.clear();
-    sameNumber_.clear();
+    ForgetRows();
     if (!FindOrderFile(path)) return;
     if (values_.archives) Archive(path);
     if (!HoldOrderFile(path)) return;
@@ -70,13 +70,21 @@ bool X12OrderImporter::SetOrderList(const std::string& path) {
   });
 }
 
-// A copy under the same name. A folder that cannot be written to is nobody's trouble.
+// A copy under the same name. A folder that cannot be written to stops nothing.
 void X12OrderImporter::Archive(const std::string& path) {
-  const HandlerOff off(Errors());
   const std::string folder = std::string(Str(Document().MapFolder)) + "archive";
   const std::string archived = folder + "/" + path.substr(path.find_last_of("/\\") + 1);
-  Try([&] { FileSystem().CreateFolder(folder); });
-  if (Try([&] { KeepArchived(path, archived); })) Try([&] { FileSystem().Copy(path, archived); });
+  try {
+    FileSystem().CreateFolder(folder);
+  } catch (const RunTimeError&) {
+    // It is there, as a rule.
+  }
+  try {
+    KeepArchived(path, archived);
+    FileSystem().Copy(path, archived);
+  } catch (const RunTimeError& error) {
+    Tell(Told::kDone, "The file " + path + " is not archived: " + error.Description());
+  }
 }
 
 // An earlier copy is replaced only by a file that begins with all of it. One that holds what has left the file since,
@@ -182,10 +190,21 @@ bool X12OrderImporter::ReadSegment() {
   SegmentReader& segments = Segments();
   if (segments.AtEnd()) return false;
   const Segment segment = segments.Read();
+  // Half a segment is an upload that isn't finished. What it says must not be taken for the whole.
+  if (!segment.ended && !segment.text.empty() && !EndsInterchange(segment.text)) {
+    segments.Seek(segment.begin);
+    segment_.Take({});
+    return false;
+  }
   if (values_.wholeLines) segment_.TakeLine(segment);
   else segment_.Take(segment);
   if (values_.cutsApostrophe && !segment.terminated) segment_.CutApostrophe();
   return true;
+}
+
+// The whole trailer of the last interchange, though nothing ends it.
+bool X12OrderImporter::EndsInterchange(std::string_view text) const {
+  return text.starts_with("IEA*") && !interchangeCtl_.empty() && text.ends_with("*" + interchangeCtl_);
 }
 
 bool X12OrderImporter::NextSegment() {

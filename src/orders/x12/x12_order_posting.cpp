@@ -218,13 +218,19 @@ double X12OrderImporter::NumberOf(Posting& posting, int n, std::string_view text
   return ReadNumber(posting, TrimBlanks(text), SegmentText(), name, isQuantity);
 }
 
-// Rows by number are looked up only here, which few files need.
-bool X12OrderImporter::EarlierStays(const ListedOrder& entry) {
-  if (sameNumber_.empty()) {
-    for (std::size_t row = 0; row < listed_.size(); ++row) sameNumber_[listed_[row].PONo].push_back(row);
+// A cancellation that waits for an order before it must not take this one, which came later, for that.
+void X12OrderImporter::MarkPosted(ListedOrder& entry) {
+  entry.done = true;
+  for (const std::uint32_t row : RowsOfNumber(entry.PONo)) {
+    ListedOrder& other = listed_[row];
+    if (&other < &entry && other.waits) other.done = true;
   }
+}
+
+bool X12OrderImporter::EarlierStays(const ListedOrder& entry) {
   const auto own = static_cast<std::size_t>(&entry - listed_.data());
-  return std::ranges::any_of(sameNumber_[entry.PONo], [&](std::size_t row) { return row < own && !listed_[row].done; });
+  return std::ranges::any_of(RowsOfNumber(entry.PONo),
+                             [&](std::uint32_t row) { return row < own && !listed_[row].done; });
 }
 
 }  // namespace partnerkit::orders

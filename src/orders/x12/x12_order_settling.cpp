@@ -84,19 +84,29 @@ class X12OrderImporter::Sweep {
       }
     }
     std::uint64_t end = importer_.Segments().Position();
-    if (untouchedFrom_ == 0) KeepCtrlZ(end);
-    else CopyUntouched(end);
-    rewrite_.Finish();
+    CopyUntouched(end);
+    if (walk_.InInterchange()) KeepOpen();
+    KeepCtrlZ(end);
+    rewrite_.Finish(end - 1);
     // The mailbox may still be at it.
     for (std::uint64_t length; (length = importer_.queue_.File().Length()) >= end; end = length + 1) {
       KeepRange({end, length + 1});
-      rewrite_.Finish();
+      rewrite_.Finish(length);
       anyLeft_ = true;
     }
   }
 
+  // The file ends within the interchange: the rest of an upload will be appended, and needs what it stands in.
+  void KeepOpen() {
+    WriteHeld(interchange_);
+    if (walk_.InOrders()) WriteHeld(group_);
+    if (inTransaction_) WriteHeld(transaction_);
+    anyLeft_ = true;
+  }
+
   // Old systems end a file with it; it stays behind whatever does.
   void KeepCtrlZ(std::uint64_t end) {
+    if (wasUntouched_) return;
     std::array<char, 1> last{};
     if (rewrite_.Empty() || end < 2 || importer_.queue_.File().ReadAt(end - 2, last) == 0) return;
     if (last[0] == kCtrlZ) rewrite_.Keep({last.data(), 1});
@@ -134,7 +144,8 @@ class X12OrderImporter::Sweep {
   }
 
   void CopyUntouched(std::uint64_t end) {
-    if (untouchedFrom_ != 0) KeepRange({untouchedFrom_, end});
+    wasUntouched_ = untouchedFrom_ != 0;
+    if (wasUntouched_) KeepRange({untouchedFrom_, end});
     untouchedFrom_ = 0;
   }
 
@@ -220,6 +231,7 @@ class X12OrderImporter::Sweep {
   bool anyLeft_ = false;
   bool added_ = false;  // the segments in hand came after the listing
   std::uint64_t untouchedFrom_ = 0;
+  bool wasUntouched_ = false;  // what came last was copied as it stands
 };
 
 bool X12OrderImporter::Term() {

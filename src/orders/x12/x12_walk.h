@@ -41,6 +41,8 @@ class X12Walk {
   bool OpensInterchange() const { return opensInterchange_; }
   // The file ends here: whether an orders group was left open.
   bool InOrders() const { return next_ == Place::kOrders; }
+  // The same of an interchange of ours.
+  bool InInterchange() const { return next_ != Place::kOutside && next_ != Place::kForeign; }
 
  private:
   bool IsOurs(const X12Segment& isa) const;

@@ -27,7 +27,13 @@ int main() try {
     put(PartnerLocn{.VendorId = "ACME", .PartnerLocnNo = number});
   }
 
-  const auto orders = CreateTranslator("PartnerKit.clsMGB850csv", platform::DefaultPorts());
+  Ports ports = platform::DefaultPorts();
+  ports.errorOutlets.dialog = [](const ErrorReport& fault, const std::string&) {  // what no class foresaw
+    std::cerr << fault.report << '\n';
+    return Button::kAbort;
+  };
+  ports.tell = [](Told, const std::string& sentence) { std::cerr << sentence << '\n'; };  // of his files
+  const auto orders = CreateTranslator("PartnerKit.clsMGB850csv", ports);
   const auto tell = [&](std::int32_t logId) {
     LogRecord log{.LogId = logId};
     if (Load(records, log)) std::cout << "   " << Str(log.Message) << '\n';
@@ -52,7 +58,6 @@ int main() try {
     posted += id != 0;
   }
   const bool settled = orders->Term();  // what was posted leaves the file
-  if (!settled) tell(orders->Log().LogId);
   host->Close();
   return settled && posted == count ? 0 : 1;
 } catch (const RunTimeError& error) {
