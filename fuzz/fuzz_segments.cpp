@@ -43,17 +43,22 @@ struct Slow {
 // One character at a time, from `at`.
 Slow ReadSlowly(std::string_view bytes, std::size_t at, const SegmentSyntax& syntax) {
   Slow slow;
+  bool ended = false;
   while (at < bytes.size()) {
     const char c = bytes[at++];
+    if (c == '\x1A' && slow.text.empty()) continue;
     if (c == '\r' || c == '\n') {
       if (slow.text.empty()) continue;
+      ended = true;
       if (syntax.wholeLines && c == '\r' && at < bytes.size() && bytes[at] == '\n') ++at;
       break;
     }
     slow.terminated = syntax.terminator != '\0' && c == syntax.terminator;
-    if (slow.terminated || (syntax.otherEnd != '\0' && c == syntax.otherEnd)) break;
+    ended = slow.terminated || (syntax.otherEnd != '\0' && c == syntax.otherEnd);
+    if (ended) break;
     slow.text += c;
   }
+  while (!ended && slow.text.ends_with('\x1A')) slow.text.pop_back();  // Ctrl-Z ends a file
   if (!slow.terminated && slow.text.find_first_not_of(' ') == std::string::npos) slow.text.clear();
   slow.end = at;
   return slow;

@@ -164,7 +164,7 @@ class X12Run : private ImportRun {
   void CheckTidy() {
     Check(!files_.AnyHeld(), "no file stays held");
     Check(files_.AllNames([](const std::string& name) {
-      return name == "inbox/orders.x12" || name == "inbox/orders.tmp" || name == kCopy ||
+      return name == "inbox/orders.x12" || name == "inbox/orders.tmp" || name.starts_with(kCopy) ||
              (name.starts_with("ack/FA_PO_") && name.ends_with("_0603081015.TXT"));
     }),
           "no file is left over");

@@ -66,6 +66,10 @@ class OrderLines {
     return Field(line, "PARTNEREDIADDR") == Str(document.PartnerEDIAddr) &&
            Field(line, "COMPANYEDIADDR") == Str(document.CompanyEDIAddr);
   }
+  // A line that names another sender or receiver.
+  bool IsOfOthers(std::string_view line) const {
+    return !IsOurs(line) && !(Field(line, "PARTNEREDIADDR").empty() && Field(line, "COMPANYEDIADDR").empty());
+  }
 
  private:
   static constexpr std::string_view kControls[] = {"INTCONTROLNO", "GRPCONTROLNO", "TRNCONTROLNO"};

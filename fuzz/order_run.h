@@ -46,7 +46,7 @@ class OrderRun : private ImportRun {
     return true;
   }
 
-  // Takes one row's transaction out. What goes is one run of lines.
+  // Takes one row's transaction out. What goes is one run of the company's lines, with nobody else's among them.
   void DeleteRow(bool last) {
     const std::string before = files_.Bytes(kOrders);
     RowTable rows;
@@ -58,16 +58,13 @@ class OrderRun : private ImportRun {
     const std::string& after = files_.Bytes(kOrders);
     // Envelope segments stay, some of them as the whole transaction.
     if (!TheSubject().rules.deletesEnvelopes && HasEnvelope(before)) return;
-    Check(after.size() < before.size(), "Delete takes something out");
-    const auto front =
-        static_cast<std::size_t>(std::mismatch(after.begin(), after.end(), before.begin()).first - after.begin());
-    const auto back =
-        static_cast<std::size_t>(std::mismatch(after.rbegin(), after.rend(), before.rbegin()).first - after.rbegin());
-    Check(front + back >= after.size(), "Delete takes one run of bytes out");
     const std::vector<std::string_view> old = LinesOf(before), left = LinesOf(after);
-    Check(std::all_of(left.begin(), left.end(),
-                      [&](std::string_view line) { return std::find(old.begin(), old.end(), line) != old.end(); }),
-          "Delete leaves whole lines");
+    Check(old.size() > left.size(), "Delete takes something out");
+    const std::vector<std::string_view> oldOwn = Own(old, true), own = Own(left, true);
+    const auto front = std::ranges::mismatch(own, oldOwn).in1 - own.begin();
+    const auto back = std::mismatch(own.rbegin(), own.rend(), oldOwn.rbegin(), oldOwn.rend()).first - own.rbegin();
+    Check(static_cast<std::size_t>(front + back) >= own.size(), "Delete takes one run of own lines out");
+    Check(Own(old, false) == Own(left, false), "Delete keeps every line of others");
     CheckTidy();
   }
 
@@ -81,6 +78,12 @@ class OrderRun : private ImportRun {
     std::string key;
     bool faulty;
   };
+
+  // The lines that are the company's or nobody's, or all others.
+  std::vector<std::string_view> Own(std::vector<std::string_view> lines, bool own) const {
+    std::erase_if(lines, [&](std::string_view line) { return (lines_.IsOfOthers(line) && !HasEnvelope(line)) == own; });
+    return lines;
+  }
 
   static bool AnyWarns(const std::vector<LogRecord>& told, std::initializer_list<std::string_view> openings) {
     return std::any_of(told.begin(), told.end(), [&](const LogRecord& log) {
@@ -141,7 +144,10 @@ class OrderRun : private ImportRun {
   // All transactions of one number leave together: one that failed goes with another of its number that was dealt with.
   void CheckFile(const std::string& before, const std::string& backup, const Settled& settled) {
     const ClassRules& rules = TheSubject().rules;
-    const std::vector<std::string_view> lines = LinesOf(before);
+    std::string_view text = before;
+    const std::string_view mark = text.starts_with("\xEF\xBB\xBF") ? text.substr(0, 3) : std::string_view();
+    text.remove_prefix(mark.size());
+    const std::vector<std::string_view> lines = LinesOf(text);
     if (rules.settlesByControls && lines_.AnyAmbiguous(lines)) return;
     std::string kept, moved = backup;
     for (const std::string_view line : lines) {
@@ -155,6 +161,7 @@ class OrderRun : private ImportRun {
         kept += line;
       }
     }
+    if (!kept.empty()) kept.insert(0, mark);
     Check(files_.Bytes(kOrders) == kept, "the file keeps every line not dealt with, and no other");
     Check(files_.Bytes(kBackup) == moved, "the backup holds every posted line, and no other");
   }

@@ -12,7 +12,7 @@ namespace {
 // What is kept of an overlong segment: enough to tell what it is.
 constexpr std::size_t kFront = 256;
 
-// Old systems end a file with it.
+// Old systems end a file with it. Anywhere else it is a character like any other.
 constexpr char kCtrlZ = '\x1A';
 
 constexpr std::uint64_t kOnes = 0x0101010101010101;
@@ -24,13 +24,13 @@ constexpr std::uint64_t Below(std::uint64_t bytes, unsigned limit) {
   return (bytes - kOnes * limit) & ~bytes & (kOnes * 0x80);
 }
 
-bool IsLineEnd(char c) { return c == '\r' || c == '\n' || c == kCtrlZ; }
+bool IsBetweenSegments(char c) { return c == '\r' || c == '\n' || c == kCtrlZ; }
 
 }  // namespace
 
 SegmentReader::SegmentReader(InputFile& file, const SegmentSyntax& syntax, std::size_t block)
     : file_(file), syntax_(syntax), buffer_(block) {
-  for (const char end : {'\r', '\n', kCtrlZ, syntax.terminator, syntax.otherEnd}) {
+  for (const char end : {'\r', '\n', syntax.terminator, syntax.otherEnd}) {
     if (end != '\0') ends_[static_cast<unsigned char>(end)] = true;
   }
 }
@@ -66,7 +66,7 @@ Segment SegmentReader::Read() {
 // False at the end of the file.
 bool SegmentReader::SkipLineEnds() {
   do {
-    while (begin_ < filled_ && IsLineEnd(buffer_[begin_])) ++begin_;
+    while (begin_ < filled_ && IsBetweenSegments(buffer_[begin_])) ++begin_;
     if (begin_ < filled_) return true;
   } while (Fill());
   return false;
@@ -81,7 +81,7 @@ std::size_t SegmentReader::FindEnd(std::size_t from) const {
     while (from + sizeof(std::uint64_t) <= filled_) {
       std::uint64_t eight;
       std::memcpy(&eight, bytes + from, sizeof eight);
-      const std::uint64_t found = Below(eight, kCtrlZ + 1) | Below(eight ^ terminator, 1) | Below(eight ^ other, 1);
+      const std::uint64_t found = Below(eight, '\r' + 1) | Below(eight ^ terminator, 1) | Below(eight ^ other, 1);
       if (found == 0) {
         from += sizeof eight;
         continue;
@@ -118,6 +118,7 @@ Segment SegmentReader::Give(std::size_t end) {
   segment.text = {buffer_.data() + begin_, end - begin_};
   segment.ended = end < filled_;
   segment.terminated = segment.ended && buffer_[end] == syntax_.terminator;
+  while (!segment.ended && segment.text.ends_with(kCtrlZ)) segment.text.remove_suffix(1);
   if (!segment.terminated && segment.text.find_first_not_of(' ') == std::string_view::npos) segment.text = {};
   segment.length = segment.text.size();
   GoBehind(end);

@@ -77,6 +77,9 @@ TEST(SegmentReaderTest, EndsSegmentsAlikeWhereverABlockEnds) {
       {kOrApostrophe, "N1*ST*X'N2~''CTT'", {"1:N1*ST*X", "9:N2~", "12:", "13:", "14:CTT"}},
       {kWholeLines, "ST~'\r\nBEG\r\rN1\n\nCTT\r\n", {"1:ST~'", "7:BEG", "12:N1", "16:CTT"}},
       {kWholeLines, "\r\n   \r\nCTT", {"3:", "8:CTT"}},
+      // Ctrl-Z ends a file, and whatever is appended to it; within a segment it is a character.
+      {kTilde, "ST*1\x1A" "0~\r\n\x1A" "BEG~\x1A", {"1:ST*1\x1A" "0~", "11:BEG~", "16:"}},
+      {kTilde, "\x1AST~IEA*1\x1A\x1A", {"2:ST~", "5:IEA*1"}},
       // clang-format on
   };
   for (const auto& c : cases) {
