@@ -29,8 +29,10 @@ LARGE_FILE_COPIES = 5
 BYTES_PER_ORDER = 60_000
 
 MODEL, SLOWEST = "clsMGB850csv", "clsColesEIDCPOcsv"
-OTHERS = {"x12": X12Bench, "barcode": BarcodeBench, "drawing": DrawingBench, "labels": LabelBench,
-          "notices": NoticesBench, "load": LoadBench}
+# The load comes first: the peak memory of a program counts what this one held as it started it, and the drawing makes
+# that a lot.
+OTHERS = {"load": LoadBench, "x12": X12Bench, "barcode": BarcodeBench, "drawing": DrawingBench, "labels": LabelBench,
+          "notices": NoticesBench}
 
 FULL = {"runs": 3, "bytes": 150_000_000, "orders": 2_000, "many": 20_000, "segments": 10_000_000,
         "barcodes": 1_000_000, "labels": 5_000, "cartons": 100_000, "shipments": 1_000, "records": 1_000_000}
@@ -51,8 +53,8 @@ def main():
     parser = argparse.ArgumentParser(prog="./pk bench", description=__doc__,
                                      formatter_class=argparse.RawDescriptionHelpFormatter)
     parser.add_argument("--quick", action="store_true", help="small sizes, once each: shows that it runs, not how fast")
-    parser.add_argument("--class", dest="named", help="one CSV class instead, or all, these at a smaller size, or x12,"
-                        " barcode, drawing, labels, notices, load")
+    parser.add_argument("--class", dest="named", help="one CSV class instead, or all, these at a smaller size, or load,"
+                        " x12, barcode, drawing, labels, notices")
     parser.add_argument("--cpu", action="store_true", help="compare processor time")
     parser.add_argument("--runs", type=int, help="how often each side runs (%d)" % FULL["runs"])
     options = parser.parse_args()
