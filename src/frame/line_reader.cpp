@@ -5,13 +5,9 @@
 #include <span>
 #include <string>
 
+#include "frame/ctrl_z.h"
+
 namespace partnerkit {
-
-namespace {
-
-constexpr char kCtrlZ = '\x1A';
-
-}  // namespace
 
 void LineReader::Seek(std::uint64_t position) {
   const std::uint64_t offset = position - 1;

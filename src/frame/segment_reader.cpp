@@ -5,15 +5,14 @@
 #include <cstring>
 #include <span>
 
+#include "frame/ctrl_z.h"
+
 namespace partnerkit {
 
 namespace {
 
 // What is kept of an overlong segment: enough to tell what it is.
 constexpr std::size_t kFront = 256;
-
-// Old systems end a file with it. Anywhere else it is a character like any other.
-constexpr char kCtrlZ = '\x1A';
 
 constexpr std::uint64_t kOnes = 0x0101010101010101;
 

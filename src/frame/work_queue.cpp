@@ -145,7 +145,7 @@ void WorkQueue::Rewrite::Replace() {
 bool WorkQueue::Rewrite::TakeLateBytes() {
   const std::uint64_t length = queue_.File().Length();
   if (length <= readTo_) return false;
-  KeepRange({readTo_ + 1, length + 1});
+  Copy({readTo_ + 1, length + 1});
   out_->Sync();
   return true;
 }
@@ -171,13 +171,24 @@ void WorkQueue::Rewrite::Remove(bool withTemporary) {
   out_.reset();
 }
 
+void WorkQueue::Rewrite::Keep(std::string_view bytes) {
+  if (Empty()) Copy({1, queue_.Begin()});
+  out_->Write(bytes);
+}
+
 void WorkQueue::Rewrite::KeepRange(ByteRange range) {
-  std::vector<char> block(256 * 1024);
+  if (Empty()) Copy({1, queue_.Begin()});
+  Copy(range);
+}
+
+void WorkQueue::Rewrite::Copy(ByteRange range) {
+  if (range.begin >= range.end) return;
+  std::vector<char> block(std::min<std::uint64_t>(256 * 1024, range.end - range.begin));
   while (range.begin < range.end) {
     const std::size_t wanted = std::min<std::uint64_t>(block.size(), range.end - range.begin);
     const std::size_t read = queue_.File().ReadAt(range.begin - 1, std::span(block).first(wanted));
     if (read == 0) throw RunTimeError(run_time::kPastEnd, "The file " + queue_.path_ + " became shorter");
-    Keep({block.data(), read});
+    out_->Write({block.data(), read});
     range.begin += read;
   }
 }

@@ -105,7 +105,8 @@ class WorkQueue {
     Rewrite& operator=(const Rewrite&) = delete;
 
     void Begin();
-    void Keep(std::string_view bytes) { out_->Write(bytes); }
+    // A byte order mark of the file goes in front of the first bytes.
+    void Keep(std::string_view bytes);
     // Nothing was kept so far.
     bool Empty() { return out_->Length() == 0; }
     // What was read of the order file is so many bytes. A mailbox that appends to it later, while it is being replaced,
@@ -130,6 +131,7 @@ class WorkQueue {
     [[noreturn]] void Fail(const RunTimeError& cause, const std::string& what);
     bool MayStay(const std::string& path);
     bool TakeLateBytes();
+    void Copy(ByteRange range);
 
     WorkQueue& queue_;
     Tell tell_;

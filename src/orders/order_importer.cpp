@@ -165,6 +165,17 @@ double OrderImporter::ReadNumber(OrderPosting& posting, std::string_view text, s
   return value;
 }
 
+std::optional<double> OrderImporter::PlainNumber(std::string_view text, bool isQuantity) {
+  if (text.empty()) return 0.0;
+  if (!IsNumber(text)) return {};
+  try {
+    const double value = NumberAtStart(text);
+    return isQuantity && value < 0 ? std::nullopt : std::optional(value);
+  } catch (const RunTimeError&) {
+    return {};
+  }
+}
+
 void OrderImporter::Refuse(OrderPosting& posting, const Unreadable& fault) {
   posting.entry.OrderId = 0;
   posting.log.Note(kRejection,

@@ -94,8 +94,10 @@ class OrderImporter : public TranslatorBase {
   // The number at the front of `text`, which `place` gives as `name` ("line 17", "ORDERQUANTITY"). One that isn't a
   // number as a whole is read as far as it is one, and warned of; so is a negative quantity. Raises Unreadable for one
   // beyond all bounds.
-  double ReadNumber(OrderPosting& posting, std::string_view text, std::string_view place, std::string_view name,
-                    bool isQuantity = false);
+  static double ReadNumber(OrderPosting& posting, std::string_view text, std::string_view place, std::string_view name,
+                           bool isQuantity = false);
+  // The same, where nothing needs to be said of it: nearly always, so that no caller makes its place up in vain.
+  static std::optional<double> PlainNumber(std::string_view text, bool isQuantity = false);
   // Tells why the order cannot be read.
   static void Refuse(OrderPosting& posting, const Unreadable& fault);
   // The order has no number, which some partners' translators let pass.

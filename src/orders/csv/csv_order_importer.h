@@ -108,7 +108,6 @@ class CsvOrderImporter : public OrderImporter {
 
   bool SettleFile();
   void DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRange>& posted);
-  void Keep(WorkQueue::Rewrite& rewrite, std::string_view bytes);
   bool WasListed(const Line& line) const { return line.End() <= listedTo_; }
   void SettledKey(std::string& key, std::string& number) const;
   std::string SettledKey(const ListedOrder& entry) const;

@@ -342,6 +342,7 @@ double CsvOrderImporter::Sum(const Posting& posting, double before, double quant
 
 double CsvOrderImporter::NumberOf(OrderField field) {
   const bool isQuantity = field == posting_->values.quantity || field == ALLOCATEQUANTITY;
+  if (const auto plain = PlainNumber(line_[field], isQuantity)) return *plain;
   return ReadNumber(*posting_, line_[field], LineText(posting_->lineNo), Name(field), isQuantity);
 }
 

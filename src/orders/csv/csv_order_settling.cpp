@@ -73,7 +73,7 @@ void CsvOrderImporter::DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRang
         outcome = processed_.Find(key);
       }
       if (!outcome || !WasListed(line) || !IsOurs()) {
-        Keep(rewrite, line.raw);
+        rewrite.Keep(line.raw);
       } else if (*outcome > 0) {
         Extend(posted, line);
       }
@@ -84,12 +84,6 @@ void CsvOrderImporter::DealOut(WorkQueue::Rewrite& rewrite, std::vector<ByteRang
   if (rewrite.Empty()) return;
   rewrite.KeepRange({lines.Position(), length + 1});
   rewrite.Finish(length);
-}
-
-// A byte order mark stays in front of whatever stays.
-void CsvOrderImporter::Keep(WorkQueue::Rewrite& rewrite, std::string_view bytes) {
-  if (rewrite.Empty()) rewrite.KeepRange({1, queue_.Begin()});
-  rewrite.Keep(bytes);
 }
 
 // What the line's order is dealt with under.
@@ -157,7 +151,7 @@ void CsvOrderImporter::CopyAllBut(WorkQueue::Rewrite& rewrite, std::uint64_t beg
     const bool envelope = IsEnvelopeSegment(line.text);
     const bool nobodys = inside && line_[kAddresses[0]].empty() && line_[kAddresses[1]].empty();
     const bool goes = envelope ? values_.deletesEnvelopes : nobodys || IsOurs();
-    if (!inside || !goes) Keep(rewrite, line.raw);
+    if (!inside || !goes) rewrite.Keep(line.raw);
   }
   const std::uint64_t length = queue_.File().Length();
   if (!rewrite.Empty()) rewrite.KeepRange({lines.Position(), length + 1});

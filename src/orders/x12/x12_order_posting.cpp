@@ -213,9 +213,11 @@ std::string X12OrderImporter::ElementOrEnd(int n, ElementForm atEnd) const {
 }
 
 double X12OrderImporter::NumberOf(Posting& posting, int n, std::string_view text, bool isQuantity) {
+  text = TrimBlanks(text);
+  if (const auto plain = PlainNumber(text, isQuantity)) return *plain;
   const std::string_view tag = segment_.Text().substr(0, segment_.Text().find('*'));
   const std::string name = std::string(tag) + (n < 10 ? "0" : "") + std::to_string(n);
-  return ReadNumber(posting, TrimBlanks(text), SegmentText(), name, isQuantity);
+  return ReadNumber(posting, text, SegmentText(), name, isQuantity);
 }
 
 // A cancellation that waits for an order before it must not take this one, which came later, for that.

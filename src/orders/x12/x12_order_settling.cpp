@@ -2,6 +2,7 @@
 #include <algorithm>
 #include <array>
 
+#include "frame/ctrl_z.h"
 #include "frame/delimited.h"
 #include "orders/x12/x12_order_importer.h"
 
@@ -10,7 +11,6 @@ namespace partnerkit::orders {
 namespace {
 
 constexpr std::string_view kLineEnd = "\r\n";
-constexpr char kCtrlZ = '\x1A';
 
 // The group's header with the mark that it was acknowledged.
 std::string Marked(std::string_view gs) {
@@ -90,7 +90,7 @@ class X12OrderImporter::Sweep {
     rewrite_.Finish(end - 1);
     // The mailbox may still be at it.
     for (std::uint64_t length; (length = importer_.queue_.File().Length()) >= end; end = length + 1) {
-      KeepRange({end, length + 1});
+      rewrite_.KeepRange({end, length + 1});
       rewrite_.Finish(length);
       anyLeft_ = true;
     }
@@ -110,12 +110,6 @@ class X12OrderImporter::Sweep {
     std::array<char, 1> last{};
     if (rewrite_.Empty() || end < 2 || importer_.queue_.File().ReadAt(end - 2, last) == 0) return;
     if (last[0] == kCtrlZ) rewrite_.Keep({last.data(), 1});
-  }
-
-  // A byte order mark stays in front of whatever stays.
-  void KeepRange(ByteRange range) {
-    if (rewrite_.Empty()) rewrite_.KeepRange({1, importer_.queue_.Begin()});
-    rewrite_.KeepRange(range);
   }
 
   // A mailbox that doesn't ask for the hold may have added to the file since it was listed. What it added of a group is
@@ -145,7 +139,7 @@ class X12OrderImporter::Sweep {
 
   void CopyUntouched(std::uint64_t end) {
     wasUntouched_ = untouchedFrom_ != 0;
-    if (wasUntouched_) KeepRange({untouchedFrom_, end});
+    if (wasUntouched_) rewrite_.KeepRange({untouchedFrom_, end});
     untouchedFrom_ = 0;
   }
 
@@ -210,12 +204,11 @@ class X12OrderImporter::Sweep {
   void Write(const X12Segment& segment) {
     if (segment.Text().empty() && !importer_.values_.keepsBareSegments) return;
     if (!segment.Overlong()) return Write(segment.Text());
-    KeepRange({segment.Begin(), segment.Begin() + segment.Length()});
+    rewrite_.KeepRange({segment.Begin(), segment.Begin() + segment.Length()});
     Write(std::string_view());
   }
 
   void Write(std::string_view text) {
-    KeepRange({1, 1});
     rewrite_.Keep(text);
     if (!importer_.values_.wholeLines) rewrite_.Keep("~");
     rewrite_.Keep(kLineEnd);
