@@ -69,6 +69,28 @@ constexpr RecordType Keyed::kType = {"Keyed", "tbKeyed", kKeyedMembers, kKeyedLo
 
 inline constexpr std::array<const RecordType*, 2> kTestTypes = {&Sample::kType, &Keyed::kType};
 
+// Samples put into a store and taken out of it.
+class SampleRecords {
+ protected:
+  ~SampleRecords() = default;
+  virtual RecordStore& Samples() = 0;
+
+  std::int32_t Added(Sample sample) {
+    EXPECT_TRUE(Add(Samples(), sample)) << sample.Code;
+    return sample.SampleId;
+  }
+  void AddKeyed(const std::string& owner, std::int32_t position, Text value) {
+    Keyed keyed{owner, position, std::move(value)};
+    EXPECT_TRUE(Add(Samples(), keyed));
+  }
+  Sample Stored(std::int32_t id) {
+    Sample sample;
+    sample.SampleId = id;
+    EXPECT_TRUE(Load(Samples(), sample)) << id;
+    return sample;
+  }
+};
+
 class StoreTest : public ::testing::Test {
  protected:
   std::string Path(std::string_view name = "store.db") const { return folder_ / name; }

@@ -26,22 +26,10 @@ struct InMemory {
 };
 
 template <class Kept>
-class RecordStoreTest : public ::testing::Test {
+class RecordStoreTest : public ::testing::Test, protected host::SampleRecords {
  protected:
-  std::int32_t Added(Sample sample) {
-    EXPECT_TRUE(Add(store_, sample)) << sample.Code;
-    return sample.SampleId;
-  }
-  void AddKeyed(const std::string& owner, std::int32_t position, Text value) {
-    Keyed keyed{owner, position, std::move(value)};
-    EXPECT_TRUE(Add(store_, keyed));
-  }
-  Sample Stored(std::int32_t id) {
-    Sample sample;
-    sample.SampleId = id;
-    EXPECT_TRUE(Load(store_, sample)) << id;
-    return sample;
-  }
+  RecordStore& Samples() override { return store_; }
+
   std::string OfNote(Text note) {
     std::string codes;
     for (const auto& sample : Select(store_, Sample::kByNote, Sample{.Note = std::move(note)})) {
