@@ -6,8 +6,8 @@
 #include <string_view>
 #include <vector>
 
-#include "frame/elements.h"
-#include "frame/segment_reader.h"
+#include "edi/elements.h"
+#include "edi/segment_reader.h"
 
 namespace {
 

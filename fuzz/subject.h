@@ -11,8 +11,8 @@
 #include <utility>
 #include <vector>
 
-#include "cli/demo.h"
-#include "cli/record_json.h"
+#include "cli/output/record_json.h"
+#include "cli/verbs/demo.h"
 #include "partnerkit/records.h"
 
 namespace partnerkit::fuzz {

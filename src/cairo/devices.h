@@ -4,7 +4,7 @@
 #include <memory>
 #include <string>
 
-#include "frame/byte_sink.h"
+#include "files/byte_sink.h"
 #include "partnerkit/drawing.h"
 
 namespace partnerkit::cairo {

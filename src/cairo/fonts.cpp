@@ -4,9 +4,9 @@
 
 #include <utility>
 
-#include "frame/windows_1252.h"
 #include "partnerkit/run_time_error.h"
 #include "platform/posix_calls.h"
+#include "values/windows_1252.h"
 
 namespace partnerkit::cairo {
 

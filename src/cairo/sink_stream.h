@@ -7,7 +7,7 @@
 #include <string_view>
 #include <utility>
 
-#include "frame/byte_sink.h"
+#include "files/byte_sink.h"
 
 namespace partnerkit::cairo {
 

@@ -3,7 +3,7 @@
 #include <cairo-svg.h>
 
 #include "cairo/outputs.h"
-#include "frame/windows_1252.h"
+#include "values/windows_1252.h"
 
 namespace partnerkit::cairo {
 

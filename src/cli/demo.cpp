@@ -10,14 +10,15 @@
 #include <sstream>
 #include <vector>
 
-#include "cli/demo_packer.h"
-#include "cli/json_writer.h"
+#include "cli/output/json_writer.h"
+#include "cli/output/table.h"
+#include "cli/output/text.h"
 #include "cli/program.h"
-#include "cli/table.h"
-#include "cli/text.h"
-#include "cli/workspace.h"
-#include "frame/format.h"
+#include "cli/verbs/demo_packer.h"
+#include "cli/workspace/demo_files.h"
+#include "cli/workspace/workspace.h"
 #include "partnerkit/records.h"
+#include "values/format.h"
 
 namespace partnerkit::cli {
 

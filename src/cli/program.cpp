@@ -6,17 +6,17 @@
 #include <functional>
 #include <new>
 
-#include "cli/command.h"
-#include "cli/data_commands.h"
 #include "cli/demo.h"
-#include "cli/example.h"
-#include "cli/json_writer.h"
-#include "cli/listings.h"
-#include "cli/print_labels.h"
-#include "cli/printers.h"
-#include "cli/run_document.h"
-#include "cli/text.h"
-#include "cli/workspace.h"
+#include "cli/output/command.h"
+#include "cli/output/json_writer.h"
+#include "cli/output/text.h"
+#include "cli/verbs/data_commands.h"
+#include "cli/verbs/example.h"
+#include "cli/verbs/listings.h"
+#include "cli/verbs/print_labels.h"
+#include "cli/verbs/printers.h"
+#include "cli/verbs/run_document.h"
+#include "cli/workspace/workspace.h"
 #include "partnerkit/version.h"
 
 namespace partnerkit::cli {

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <utility>
 
-#include "frame/numbers.h"
+#include "values/numbers.h"
 
 namespace partnerkit {
 

@@ -1,7 +1,7 @@
-#include "frame/numbers.h"
 #include "partnerkit/records.h"
 #include "partnerkit/run_time_error.h"
 #include "partnerkit/store.h"
+#include "values/numbers.h"
 
 namespace partnerkit {
 

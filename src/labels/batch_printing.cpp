@@ -3,10 +3,10 @@
 #include <memory>
 #include <vector>
 
-#include "frame/format.h"
-#include "frame/windows_1252.h"
 #include "labels/carton_label.h"
 #include "labels/other_languages.h"
+#include "values/format.h"
+#include "values/windows_1252.h"
 
 namespace partnerkit::labels {
 

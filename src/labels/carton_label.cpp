@@ -1,9 +1,9 @@
 #include "labels/carton_label.h"
 
-#include "frame/windows_1252.h"
 #include "labels/other_languages.h"
 #include "labels/scanning.h"
 #include "render/label_packets.h"
+#include "values/windows_1252.h"
 
 namespace partnerkit::labels {
 

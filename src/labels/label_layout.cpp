@@ -2,7 +2,7 @@
 
 #include <vector>
 
-#include "frame/windows_1252.h"
+#include "values/windows_1252.h"
 
 namespace partnerkit::labels {
 

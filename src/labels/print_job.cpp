@@ -5,7 +5,7 @@
 #include <thread>
 #include <vector>
 
-#include "frame/numbers.h"
+#include "values/numbers.h"
 
 namespace partnerkit::labels {
 

@@ -3,10 +3,10 @@
 #include <memory>
 #include <vector>
 
-#include "frame/delimited.h"
-#include "frame/format.h"
-#include "frame/numbers.h"
-#include "frame/windows_1252.h"
+#include "values/delimited.h"
+#include "values/format.h"
+#include "values/numbers.h"
+#include "values/windows_1252.h"
 
 namespace partnerkit::labels {
 

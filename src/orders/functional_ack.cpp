@@ -6,8 +6,8 @@
 #include <utility>
 #include <vector>
 
-#include "frame/file_name.h"
-#include "frame/format.h"
+#include "files/file_name.h"
+#include "values/format.h"
 
 namespace partnerkit::orders {
 

@@ -4,7 +4,7 @@
 
 #include <string_view>
 
-#include "frame/envelopes.h"
+#include "edi/envelopes.h"
 #include "frame/translator_base.h"
 
 namespace partnerkit::orders {

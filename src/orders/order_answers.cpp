@@ -4,7 +4,7 @@
 #include <cctype>
 #include <string_view>
 
-#include "frame/delimited.h"
+#include "values/delimited.h"
 
 namespace partnerkit::orders {
 

@@ -1,6 +1,6 @@
 #include "orders/order_checks.h"
 
-#include "frame/numbers.h"
+#include "values/numbers.h"
 
 namespace partnerkit::orders {
 

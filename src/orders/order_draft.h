@@ -5,8 +5,8 @@
 #include <string>
 #include <string_view>
 
-#include "frame/keyed_list.h"
 #include "partnerkit/records.h"
+#include "values/keyed_list.h"
 
 namespace partnerkit::orders {
 

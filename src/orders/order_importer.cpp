@@ -3,9 +3,9 @@
 #include <algorithm>
 #include <numeric>
 
-#include "frame/numbers.h"
 #include "orders/order_columns.h"
 #include "orders/order_store.h"
+#include "values/numbers.h"
 
 namespace partnerkit::orders {
 

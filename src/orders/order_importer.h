@@ -9,7 +9,7 @@
 #include <string_view>
 #include <vector>
 
-#include "frame/work_queue.h"
+#include "files/work_queue.h"
 #include "orders/listed_order.h"
 #include "orders/order_checks.h"
 #include "orders/order_draft.h"

@@ -2,9 +2,9 @@
 
 #include <array>
 
-#include "frame/delimited.h"
-#include "frame/free_format.h"
-#include "frame/numbers.h"
+#include "files/free_format.h"
+#include "values/delimited.h"
+#include "values/numbers.h"
 
 namespace partnerkit::orders {
 

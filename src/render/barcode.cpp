@@ -8,7 +8,7 @@
 #include <memory_resource>
 #include <utility>
 
-#include "frame/numbers.h"
+#include "values/numbers.h"
 
 namespace partnerkit::render {
 

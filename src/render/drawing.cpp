@@ -2,8 +2,8 @@
 
 #include <cmath>
 
-#include "frame/numbers.h"
 #include "render/barcode.h"
+#include "values/numbers.h"
 
 namespace partnerkit::render {
 

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "frame/numbers.h"
+#include "values/numbers.h"
 
 namespace partnerkit::render {
 

@@ -4,8 +4,8 @@
 #include <cmath>
 #include <unordered_map>
 
-#include "frame/numbers.h"
 #include "partnerkit/run_time_error.h"
+#include "values/numbers.h"
 
 namespace partnerkit::render {
 

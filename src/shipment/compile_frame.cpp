@@ -2,9 +2,9 @@
 
 #include <algorithm>
 
-#include "frame/file_name.h"
-#include "frame/format.h"
+#include "files/file_name.h"
 #include "shipment/lead_circles.h"
+#include "values/format.h"
 
 namespace partnerkit::shipment {
 

@@ -1,8 +1,8 @@
 #include "shipment/inventory_record.h"
 
-#include "frame/format.h"
-#include "frame/numbers.h"
-#include "frame/outbound_value.h"
+#include "values/format.h"
+#include "values/numbers.h"
+#include "values/outbound_value.h"
 
 namespace partnerkit::shipment {
 

@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "frame/byte_sink.h"
+#include "files/byte_sink.h"
 #include "partnerkit/records.h"
 #include "partnerkit/spooling.h"
 #include "spool/destination.h"

@@ -9,7 +9,7 @@
 #include <utility>
 #include <vector>
 
-#include "cli/label_host.h"
+#include "cli/workspace/label_host.h"
 #include "host/sql_session.h"
 #include "partnerkit/label.h"
 #include "partnerkit/spooling.h"

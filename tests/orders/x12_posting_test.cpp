@@ -1,8 +1,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "frame/numbers.h"
 #include "support/x12_orders.h"
+#include "values/numbers.h"
 
 namespace partnerkit::testing {
 namespace {

@@ -1,6 +1,6 @@
 // Purchase orders of CML by way of the freight forwarder.
-#include "frame/dates.h"
 #include "orders/csv/csv_classes.h"
+#include "values/dates.h"
 
 namespace partnerkit::orders {
 

@@ -2,8 +2,8 @@
 // and the ship-to's address in the order.
 #include <algorithm>
 
-#include "frame/numbers.h"
 #include "orders/csv/csv_classes.h"
+#include "values/numbers.h"
 
 namespace partnerkit::orders {
 

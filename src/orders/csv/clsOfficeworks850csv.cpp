@@ -1,7 +1,7 @@
 // Purchase orders of Officeworks: changes and cancellations by its own codes, and packs within packs.
-#include "frame/numbers.h"
 #include "orders/csv/csv_classes.h"
 #include "orders/order_answers.h"
+#include "values/numbers.h"
 
 namespace partnerkit::orders {
 

@@ -1,6 +1,6 @@
 // Purchase orders of Target for bulk deliveries.
-#include "frame/numbers.h"
 #include "orders/csv/csv_classes.h"
+#include "values/numbers.h"
 
 namespace partnerkit::orders {
 

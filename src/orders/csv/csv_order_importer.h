@@ -10,8 +10,8 @@
 #include <unordered_map>
 #include <vector>
 
-#include "frame/field_map.h"
-#include "frame/line_reader.h"
+#include "files/field_map.h"
+#include "files/line_reader.h"
 #include "orders/csv/csv_order_line.h"
 #include "orders/csv/csv_order_values.h"
 #include "orders/order_importer.h"

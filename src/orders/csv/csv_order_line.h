@@ -7,9 +7,9 @@
 #include <string>
 #include <string_view>
 
-#include "frame/delimited.h"
-#include "frame/field_map.h"
+#include "files/field_map.h"
 #include "orders/csv/order_fields.h"
+#include "values/delimited.h"
 
 namespace partnerkit::orders {
 

@@ -3,10 +3,10 @@
 #include <exception>
 #include <utility>
 
-#include "frame/dates.h"
 #include "orders/csv/csv_order_importer.h"
 #include "orders/order_columns.h"
 #include "orders/products_from_orders.h"
+#include "values/dates.h"
 
 namespace partnerkit::orders {
 

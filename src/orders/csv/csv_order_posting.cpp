@@ -1,10 +1,10 @@
 // Posting one transaction of a CSV order file.
-#include "frame/dates.h"
-#include "frame/format.h"
-#include "frame/numbers.h"
 #include "orders/csv/csv_order_importer.h"
 #include "orders/order_store.h"
 #include "orders/products_from_orders.h"
+#include "values/dates.h"
+#include "values/format.h"
+#include "values/numbers.h"
 
 namespace partnerkit::orders {
 

@@ -1,6 +1,6 @@
 #include "orders/csv/gtin_order_importer.h"
 
-#include "frame/dates.h"
+#include "values/dates.h"
 
 namespace partnerkit::orders {
 

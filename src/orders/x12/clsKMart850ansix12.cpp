@@ -1,8 +1,8 @@
 // Purchase orders of Kmart, and changes to them: releases of blanket orders, and orders that are stored with their
 // faults.
-#include "frame/delimited.h"
 #include "orders/order_answers.h"
 #include "orders/x12/x12_classes.h"
+#include "values/delimited.h"
 
 namespace partnerkit::orders {
 

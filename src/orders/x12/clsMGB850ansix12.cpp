@@ -1,6 +1,6 @@
 // Purchase orders of MGB.
-#include "frame/format.h"
 #include "orders/x12/x12_classes.h"
+#include "values/format.h"
 
 namespace partnerkit::orders {
 

@@ -11,7 +11,7 @@
 #include <string>
 #include <string_view>
 
-#include "frame/segment_reader.h"
+#include "edi/segment_reader.h"
 #include "orders/order_importer.h"
 #include "orders/x12/x12_order_values.h"
 #include "orders/x12/x12_segment.h"

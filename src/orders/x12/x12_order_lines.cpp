@@ -1,8 +1,8 @@
 // The lines of an X12 order and the stores that they go to.
 #include <utility>
 
-#include "frame/delimited.h"
 #include "orders/x12/x12_order_importer.h"
+#include "values/delimited.h"
 
 namespace partnerkit::orders {
 

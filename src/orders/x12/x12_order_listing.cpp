@@ -2,10 +2,10 @@
 #include <algorithm>
 #include <span>
 
-#include "frame/delimited.h"
 #include "orders/functional_ack.h"
 #include "orders/order_columns.h"
 #include "orders/x12/x12_order_importer.h"
+#include "values/delimited.h"
 
 namespace partnerkit::orders {
 

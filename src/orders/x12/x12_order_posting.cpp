@@ -2,10 +2,10 @@
 #include <algorithm>
 #include <cctype>
 
-#include "frame/delimited.h"
 #include "orders/order_export.h"
 #include "orders/order_store.h"
 #include "orders/x12/x12_order_importer.h"
+#include "values/delimited.h"
 
 namespace partnerkit::orders {
 

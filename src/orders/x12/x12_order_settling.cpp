@@ -2,9 +2,9 @@
 #include <algorithm>
 #include <array>
 
-#include "frame/ctrl_z.h"
-#include "frame/delimited.h"
+#include "files/ctrl_z.h"
 #include "orders/x12/x12_order_importer.h"
+#include "values/delimited.h"
 
 namespace partnerkit::orders {
 

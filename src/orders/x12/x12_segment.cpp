@@ -2,9 +2,9 @@
 
 #include <algorithm>
 
-#include "frame/dates.h"
-#include "frame/delimited.h"
 #include "partnerkit/run_time_error.h"
+#include "values/dates.h"
+#include "values/delimited.h"
 
 namespace partnerkit::orders {
 

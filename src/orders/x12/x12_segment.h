@@ -6,8 +6,8 @@
 #include <string>
 #include <string_view>
 
-#include "frame/elements.h"
-#include "frame/segment_reader.h"
+#include "edi/elements.h"
+#include "edi/segment_reader.h"
 #include "partnerkit/values.h"
 
 namespace partnerkit::orders {

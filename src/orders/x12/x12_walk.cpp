@@ -3,7 +3,7 @@
 #include <cstdint>
 #include <limits>
 
-#include "frame/delimited.h"
+#include "values/delimited.h"
 
 namespace partnerkit::orders {
 

@@ -1,8 +1,8 @@
 // Despatch advices to CML by way of the freight forwarder.
-#include "frame/delimited.h"
-#include "frame/format.h"
 #include "shipment/csv/csv_notice_classes.h"
 #include "shipment/csv/despatch_advice_fields.h"
+#include "values/delimited.h"
+#include "values/format.h"
 
 namespace partnerkit::shipment {
 

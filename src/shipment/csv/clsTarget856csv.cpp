@@ -1,6 +1,6 @@
 // Ship notices to Target.
-#include "frame/format.h"
 #include "shipment/csv/csv_notice_classes.h"
+#include "values/format.h"
 
 namespace partnerkit::shipment {
 

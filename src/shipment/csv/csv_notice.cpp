@@ -2,10 +2,10 @@
 
 #include <algorithm>
 
-#include "frame/delimited.h"
-#include "frame/numbers.h"
-#include "frame/outbound_value.h"
 #include "shipment/inventory_record.h"
+#include "values/delimited.h"
+#include "values/numbers.h"
+#include "values/outbound_value.h"
 
 namespace partnerkit::shipment {
 

@@ -9,7 +9,7 @@
 #include <string_view>
 #include <vector>
 
-#include "frame/field_map.h"
+#include "files/field_map.h"
 #include "shipment/compile_frame.h"
 #include "shipment/csv/csv_notice_fields.h"
 #include "shipment/notice_records.h"

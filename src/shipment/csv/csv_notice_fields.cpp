@@ -1,9 +1,9 @@
 #include "shipment/csv/csv_notice_fields.h"
 
-#include "frame/delimited.h"
-#include "frame/format.h"
-#include "frame/numbers.h"
 #include "shipment/compile_frame.h"
+#include "values/delimited.h"
+#include "values/format.h"
+#include "values/numbers.h"
 
 namespace partnerkit::shipment {
 
