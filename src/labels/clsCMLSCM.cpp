@@ -1,5 +1,5 @@
+#include "labels/carton_label.h"
 #include "labels/cml_carton_layout.h"
-#include "labels/label_classes.h"
 
 namespace partnerkit::labels {
 
@@ -13,6 +13,6 @@ constexpr CartonClass kClass{
 
 }  // namespace
 
-clsCMLSCM::clsCMLSCM(const Ports& ports) : CartonLabel(kClass, ports) {}
+std::unique_ptr<LabelClass> MakeCMLSCM(const Ports& ports) { return std::make_unique<CartonLabel>(kClass, ports); }
 
 }  // namespace partnerkit::labels

@@ -1,7 +1,8 @@
 #include "labels/label_fields.h"
 
-#include "labels/label_classes.h"
+#include "labels/carton_label.h"
 #include "labels/label_trade.h"
+#include "partnerkit/catalogue.h"
 
 namespace partnerkit::labels {
 namespace {
@@ -10,9 +11,9 @@ using testing::LabelTrade;
 using V = LabelValues;
 
 LabelValues Filled(LabelTrade& trade, LabelValues values = {}) {
-  clsCMLSCM label(trade.ports);
-  EXPECT_TRUE(label.Init(trade.labelHost, ""));
-  FillValues(label, trade.pack, {}, values);
+  const auto label = CreateLabelClass("PartnerKit.clsCMLSCM", trade.ports);
+  EXPECT_TRUE(label->Init(trade.labelHost, ""));
+  FillValues(dynamic_cast<CartonLabel&>(*label), trade.pack, {}, values);
   return values;
 }
 

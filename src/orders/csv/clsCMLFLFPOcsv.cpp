@@ -1,5 +1,5 @@
 // Purchase orders of CML by way of the freight forwarder.
-#include "orders/csv/csv_classes.h"
+#include "orders/csv/gtin_order_importer.h"
 #include "values/dates.h"
 
 namespace partnerkit::orders {
@@ -24,9 +24,15 @@ constexpr CsvOrderValues kValues{
     .keepsTurnedAway = true,
 };
 
-}  // namespace
+class clsCMLFLFPOcsv final : public GtinOrderImporter {
+ public:
+  explicit clsCMLFLFPOcsv(const Ports& ports) : GtinOrderImporter(kValues, ports) {}
 
-clsCMLFLFPOcsv::clsCMLFLFPOcsv(const Ports& ports) : GtinOrderImporter(kValues, ports) {}
+ private:
+  std::string_view OrderNumber(std::string& number) const override;
+  bool BeginPosting(Posting& posting) override;
+  void FillLine(Posting& posting, OrderLine& line) override;
+};
 
 std::string_view clsCMLFLFPOcsv::OrderNumber(std::string& number) const {
   if ((*this)[PONUMBER].size() > kShortNumber) return (*this)[PONUMBER];
@@ -48,5 +54,9 @@ void clsCMLFLFPOcsv::FillLine(Posting& posting, OrderLine& line) {
   line.UOM = std::string(uom.empty() ? "CT" : uom);
   line.DeliveryDate = OrderDate((*this)[DELDATE]);
 }
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeCMLFLFPOcsv(const Ports& ports) { return std::make_unique<clsCMLFLFPOcsv>(ports); }
 
 }  // namespace partnerkit::orders

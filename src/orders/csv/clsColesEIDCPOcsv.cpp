@@ -2,7 +2,7 @@
 // and the ship-to's address in the order.
 #include <algorithm>
 
-#include "orders/csv/csv_classes.h"
+#include "orders/csv/gtin_order_importer.h"
 #include "values/numbers.h"
 
 namespace partnerkit::orders {
@@ -66,9 +66,20 @@ constexpr CsvOrderValues kValues{
     .deleteOnEmptyAnywhere = true,
 };
 
-}  // namespace
+class clsColesEIDCPOcsv final : public CsvOrderImporter {
+ public:
+  explicit clsColesEIDCPOcsv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
 
-clsColesEIDCPOcsv::clsColesEIDCPOcsv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
+ private:
+  LineProduct CheckLineProduct(Posting& posting) override;
+  double LineQuantity(const Posting& posting) override;
+  void CheckLineLocations(Posting& posting) override;
+
+  Text PrepackProduct(const std::string& number);
+  std::shared_ptr<ProductInner> CartonInner(Posting& posting, const std::string& number);
+  void CheckGstPrices(Posting& posting, std::string_view productNo);
+  void AddAddress();
+};
 
 // A carton's number is that of a prepack or a GTIN; any other is a product's.
 CsvOrderImporter::LineProduct clsColesEIDCPOcsv::CheckLineProduct(Posting& posting) {
@@ -162,6 +173,12 @@ void clsColesEIDCPOcsv::AddAddress() {
     location.Postcode = std::string((*this)[HEADER5]);
     Try([&] { return known ? Update(Records(), location) : Add(Records(), location); });
   });
+}
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeColesEIDCPOcsv(const Ports& ports) {
+  return std::make_unique<clsColesEIDCPOcsv>(ports);
 }
 
 }  // namespace partnerkit::orders

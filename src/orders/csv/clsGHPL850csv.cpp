@@ -1,5 +1,5 @@
 // Purchase orders of GHPL.
-#include "orders/csv/csv_classes.h"
+#include "orders/csv/csv_order_importer.h"
 
 namespace partnerkit::orders {
 
@@ -32,14 +32,22 @@ constexpr CsvOrderValues kValues{
                 .checks = {.uom = false, .symbology = Symbology::kSkip, .retail = false}},
 };
 
-}  // namespace
+class clsGHPL850csv final : public CsvOrderImporter {
+ public:
+  explicit clsGHPL850csv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
 
-clsGHPL850csv::clsGHPL850csv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
+ private:
+  void FillLine(Posting& posting, OrderLine& line) override;
+};
 
 // The order's products are counted, from 1.
 void clsGHPL850csv::FillLine(Posting& posting, OrderLine& line) {
   CsvOrderImporter::FillLine(posting, line);
   line.LineNo = std::to_string(posting.draft.lines.Count() + 1);
 }
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeGHPL850csv(const Ports& ports) { return std::make_unique<clsGHPL850csv>(ports); }
 
 }  // namespace partnerkit::orders

@@ -1,5 +1,5 @@
 // Purchase orders of Kmart: releases of blanket orders, and orders that are stored with their faults.
-#include "orders/csv/csv_classes.h"
+#include "orders/csv/csv_order_importer.h"
 #include "orders/order_answers.h"
 
 namespace partnerkit::orders {
@@ -64,9 +64,20 @@ constexpr CsvOrderValues kValues{
                            .retail = false}},
 };
 
-}  // namespace
+class clsKMart850csv final : public CsvOrderImporter {
+ public:
+  explicit clsKMart850csv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
+  bool Init(System& system, std::int16_t EDIDocId, ColumnTable& Columns) override;
 
-clsKMart850csv::clsKMart850csv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
+ private:
+  std::string_view OrderNumber(std::string& number) const override;
+  bool BeginPosting(Posting& posting) override;
+  void FillHeader(Posting& posting) override;
+  bool LineCounts() override;
+  void CheckLineLocations(Posting& posting) override;
+
+  bool answersOrders_ = false;  // an order acknowledgement goes back to the partner
+};
 
 bool clsKMart850csv::Init(System& system, std::int16_t EDIDocId, ColumnTable& Columns) {
   const bool bound = CsvOrderImporter::Init(system, EDIDocId, Columns);
@@ -110,5 +121,9 @@ void clsKMart850csv::CheckLineLocations(Posting& posting) {
   }
   CheckBuyingLocn(posting);
 }
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeKMart850csv(const Ports& ports) { return std::make_unique<clsKMart850csv>(ports); }
 
 }  // namespace partnerkit::orders

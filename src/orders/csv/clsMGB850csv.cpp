@@ -1,5 +1,5 @@
 // Purchase orders of the MGB stores.
-#include "orders/csv/csv_classes.h"
+#include "orders/csv/csv_order_importer.h"
 
 namespace partnerkit::orders {
 
@@ -14,6 +14,8 @@ constexpr CsvOrderValues kValues{
 
 }  // namespace
 
-clsMGB850csv::clsMGB850csv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
+std::unique_ptr<Translator> MakeMGB850csv(const Ports& ports) {
+  return std::make_unique<CsvOrderImporter>(kValues, ports);
+}
 
 }  // namespace partnerkit::orders

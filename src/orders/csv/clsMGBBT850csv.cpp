@@ -1,6 +1,6 @@
 // Purchase orders of MGB by the business-to-business translator: a line with a store zone belongs to a customer's
 // order, one without to a merchandise order.
-#include "orders/csv/csv_classes.h"
+#include "orders/csv/clsMGBBT850csv.h"
 
 namespace partnerkit::orders {
 
@@ -92,5 +92,7 @@ CsvOrderImporter::Next clsMGBBT850csv::LookAtLine(Posting& posting) {
   posting.log.Note(kRejection, words::kOrderCancelled.With(posting.entry.PONo));
   return TurnAway(posting);
 }
+
+std::unique_ptr<Translator> MakeMGBBT850csv(const Ports& ports) { return std::make_unique<clsMGBBT850csv>(ports); }
 
 }  // namespace partnerkit::orders

@@ -1,5 +1,5 @@
 // Purchase orders of Officeworks: changes and cancellations by its own codes, and packs within packs.
-#include "orders/csv/csv_classes.h"
+#include "orders/csv/csv_order_importer.h"
 #include "orders/order_answers.h"
 #include "values/numbers.h"
 
@@ -55,9 +55,18 @@ constexpr CsvOrderValues kValues{
                 .checks = {.uom = false, .symbology = Symbology::kWarn, .retail = false}},
 };
 
-}  // namespace
+class clsOfficeworks850csv final : public CsvOrderImporter {
+ public:
+  explicit clsOfficeworks850csv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
 
-clsOfficeworks850csv::clsOfficeworks850csv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
+ private:
+  void FillHeader(Posting& posting) override;
+  void CheckFoundProduct(Posting& posting, const Product& product) override;
+  void FillLine(Posting& posting, OrderLine& line) override;
+
+  double PackQuantity(OrderField field);
+  void CheckPack(Posting& posting, const std::string& number, std::string_view what, double quantity, double units);
+};
 
 void clsOfficeworks850csv::FillHeader(Posting& posting) {
   CsvOrderImporter::FillHeader(posting);
@@ -92,6 +101,12 @@ void clsOfficeworks850csv::FillLine(Posting& posting, OrderLine& line) {
   CsvOrderImporter::FillLine(posting, line);
   line.PackSize = PackQuantity(UNITSINNERPACK);
   line.PackCount = PackQuantity(CARTONSOUTER);
+}
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeOfficeworks850csv(const Ports& ports) {
+  return std::make_unique<clsOfficeworks850csv>(ports);
 }
 
 }  // namespace partnerkit::orders

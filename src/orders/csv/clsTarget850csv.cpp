@@ -1,7 +1,7 @@
 // Purchase orders of Target.
 #include <cmath>
 
-#include "orders/csv/csv_classes.h"
+#include "orders/csv/csv_order_importer.h"
 
 namespace partnerkit::orders {
 
@@ -44,9 +44,14 @@ constexpr CsvOrderValues kValues{
                 .checks = {.sameABN = true}},
 };
 
-}  // namespace
+class clsTarget850csv final : public CsvOrderImporter {
+ public:
+  explicit clsTarget850csv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
 
-clsTarget850csv::clsTarget850csv(const Ports& ports) : CsvOrderImporter(kValues, ports) {}
+ private:
+  LineProduct CheckLineProduct(Posting& posting) override;
+  void FillLine(Posting& posting, OrderLine& line) override;
+};
 
 CsvOrderImporter::LineProduct clsTarget850csv::CheckLineProduct(Posting& posting) {
   LineProduct product = CsvOrderImporter::CheckLineProduct(posting);
@@ -60,5 +65,9 @@ void clsTarget850csv::FillLine(Posting& posting, OrderLine& line) {
   line.PackSize = std::trunc(NumberOf(UNITSINNERPACK));
   line.PackUOM = std::string((*this)[PACKUOM]);
 }
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeTarget850csv(const Ports& ports) { return std::make_unique<clsTarget850csv>(ports); }
 
 }  // namespace partnerkit::orders

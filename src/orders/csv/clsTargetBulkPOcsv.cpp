@@ -1,5 +1,5 @@
 // Purchase orders of Target for bulk deliveries.
-#include "orders/csv/csv_classes.h"
+#include "orders/csv/gtin_order_importer.h"
 #include "values/numbers.h"
 
 namespace partnerkit::orders {
@@ -32,9 +32,14 @@ constexpr CsvOrderValues kValues{
     .keepsTurnedAway = true,
 };
 
-}  // namespace
+class clsTargetBulkPOcsv final : public GtinOrderImporter {
+ public:
+  explicit clsTargetBulkPOcsv(const Ports& ports) : GtinOrderImporter(kValues, ports) {}
 
-clsTargetBulkPOcsv::clsTargetBulkPOcsv(const Ports& ports) : GtinOrderImporter(kValues, ports) {}
+ private:
+  void CheckInner(Posting& posting, const ProductInner& inner) override;
+  void FillLine(Posting& posting, OrderLine& line) override;
+};
 
 void clsTargetBulkPOcsv::CheckInner(Posting& posting, const ProductInner& inner) {
   const std::string_view ordered = (*this)[UNITSINNERPACK];
@@ -46,6 +51,12 @@ void clsTargetBulkPOcsv::CheckInner(Posting& posting, const ProductInner& inner)
 void clsTargetBulkPOcsv::FillLine(Posting& posting, OrderLine& line) {
   CsvOrderImporter::FillLine(posting, line);
   line.UOM = "CT";
+}
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeTargetBulkPOcsv(const Ports& ports) {
+  return std::make_unique<clsTargetBulkPOcsv>(ports);
 }
 
 }  // namespace partnerkit::orders

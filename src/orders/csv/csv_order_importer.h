@@ -20,6 +20,8 @@ namespace partnerkit::orders {
 
 class CsvOrderImporter : public OrderImporter {
  public:
+  // The values must outlive the object.
+  CsvOrderImporter(const CsvOrderValues& values, const Ports& ports);
   bool Init(System& system, std::int16_t EDIDocId, ColumnTable& Columns) override;
   std::int32_t Load(const std::string& a_sFileName, RowTable& a_vtRows) override;
   std::int32_t Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog) override;
@@ -31,8 +33,6 @@ class CsvOrderImporter : public OrderImporter {
   void SetFields(std::string_view aLine, std::vector<std::string>& aFields) const;
 
  protected:
-  CsvOrderImporter(const CsvOrderValues& values, const Ports& ports);
-
   struct Posting : OrderPosting {
     Posting(CsvOrderImporter& importer, ListedOrder& listed, const PostingValues& postingValues, ErrorList& errorList);
 

@@ -1,7 +1,7 @@
 // Purchase orders of Kmart, and changes to them: releases of blanket orders, and orders that are stored with their
 // faults.
 #include "orders/order_answers.h"
-#include "orders/x12/x12_classes.h"
+#include "orders/x12/x12_order_importer.h"
 #include "values/delimited.h"
 
 namespace partnerkit::orders {
@@ -56,9 +56,20 @@ constexpr X12OrderValues kValues{
                .retail = false},
 };
 
-}  // namespace
+class clsKMart850ansix12 final : public X12OrderImporter {
+ public:
+  explicit clsKMart850ansix12(const Ports& ports) : X12OrderImporter(kValues, ports) {}
+  bool Init(System& system, std::int16_t EDIDocId, ColumnTable& Columns) override;
 
-clsKMart850ansix12::clsKMart850ansix12(const Ports& ports) : X12OrderImporter(kValues, ports) {}
+ private:
+  std::string OrderNumber() override;
+  void BeginPosting(Posting& posting) override;
+  void FillHeader(Posting& posting) override;
+  void ReadOther(Posting& posting) override;
+  std::string ReleaseNo();
+
+  bool answersOrders_ = false;  // an order acknowledgement goes back to the partner
+};
 
 bool clsKMart850ansix12::Init(System& system, std::int16_t EDIDocId, ColumnTable& Columns) {
   const bool bound = X12OrderImporter::Init(system, EDIDocId, Columns);
@@ -99,6 +110,12 @@ void clsKMart850ansix12::ReadOther(Posting& posting) {
     if (mark.starts_with("AD") && mark.size() > 4) header.Header1 = mark.substr(mark.size() - 4);
     if (elements == 5) header.Header4 = Element(5, kRest);
   }
+}
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeKMart850ansix12(const Ports& ports) {
+  return std::make_unique<clsKMart850ansix12>(ports);
 }
 
 }  // namespace partnerkit::orders

@@ -1,5 +1,5 @@
 // Purchase orders of MGB.
-#include "orders/x12/x12_classes.h"
+#include "orders/x12/x12_order_importer.h"
 #include "values/format.h"
 
 namespace partnerkit::orders {
@@ -35,9 +35,14 @@ constexpr X12OrderValues kValues{
     .exports = true,
 };
 
-}  // namespace
+class clsMGB850ansix12 final : public X12OrderImporter {
+ public:
+  explicit clsMGB850ansix12(const Ports& ports) : X12OrderImporter(kValues, ports) {}
 
-clsMGB850ansix12::clsMGB850ansix12(const Ports& ports) : X12OrderImporter(kValues, ports) {}
+ private:
+  void ReadOther(Posting& posting) override;
+  void TakeDate(Order& order) override;
+};
 
 // Whatever a reference is called, it is the department.
 void clsMGB850ansix12::ReadOther(Posting& posting) {
@@ -54,5 +59,9 @@ void clsMGB850ansix12::TakeDate(Order& order) {
   if (const auto advertised = InHand().FixedDate(9))
     order.Note = "Advertised date " + Format(*advertised, "Short Date");
 }
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeMGB850ansix12(const Ports& ports) { return std::make_unique<clsMGB850ansix12>(ports); }
 
 }  // namespace partnerkit::orders

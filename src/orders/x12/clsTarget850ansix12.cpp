@@ -1,5 +1,5 @@
 // Purchase orders of Target: blanket orders and releases, direct deliveries to stores.
-#include "orders/x12/x12_classes.h"
+#include "orders/x12/x12_order_importer.h"
 
 namespace partnerkit::orders {
 
@@ -36,9 +36,13 @@ constexpr X12OrderValues kValues{
     .deletesTemporary = false,
 };
 
-}  // namespace
+class clsTarget850ansix12 final : public X12OrderImporter {
+ public:
+  explicit clsTarget850ansix12(const Ports& ports) : X12OrderImporter(kValues, ports) {}
 
-clsTarget850ansix12::clsTarget850ansix12(const Ports& ports) : X12OrderImporter(kValues, ports) {}
+ private:
+  void ReadOther(Posting& posting) override;
+};
 
 // Marks for the carton, and for the ticket.
 void clsTarget850ansix12::ReadOther(Posting& posting) {
@@ -51,6 +55,12 @@ void clsTarget850ansix12::ReadOther(Posting& posting) {
   } else if (kind == "F") {
     header.Header3 = Element(5, {ElementForm::kLast});
   }
+}
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeTarget850ansix12(const Ports& ports) {
+  return std::make_unique<clsTarget850ansix12>(ports);
 }
 
 }  // namespace partnerkit::orders

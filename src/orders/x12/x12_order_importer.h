@@ -21,6 +21,8 @@ namespace partnerkit::orders {
 
 class X12OrderImporter : public OrderImporter {
  public:
+  // The values must outlive the object.
+  X12OrderImporter(const X12OrderValues& values, const Ports& ports);
   bool Init(System& system, std::int16_t EDIDocId, ColumnTable& Columns) override;
   std::int32_t Load(const std::string& a_sFileName, RowTable& a_vtRows) override;
   std::int32_t Process(std::int32_t a_lRowNum, ErrorList& vtErrorLog) override;
@@ -29,8 +31,6 @@ class X12OrderImporter : public OrderImporter {
   void Cancel() override;
 
  protected:
-  X12OrderImporter(const X12OrderValues& values, const Ports& ports);
-
   // One call of `Process`.
   struct Posting : OrderPosting {
     using OrderPosting::OrderPosting;

@@ -1,5 +1,5 @@
 // Despatch advices to CML by way of the freight forwarder.
-#include "shipment/csv/csv_notice_classes.h"
+#include "shipment/csv/csv_notice.h"
 #include "shipment/csv/despatch_advice_fields.h"
 #include "values/delimited.h"
 #include "values/format.h"
@@ -33,9 +33,14 @@ constexpr CsvNoticeValues kValues{
     .deliveryDocket = true,
 };
 
-}  // namespace
+class clsCMLFLFDAcsv final : public CsvNotice {
+ public:
+  explicit clsCMLFLFDAcsv(const Ports& ports) : CsvNotice(kValues, ports) {}
 
-clsCMLFLFDAcsv::clsCMLFLFDAcsv(const Ports& ports) : CsvNotice(kValues, ports) {}
+ private:
+  bool Prepare(Notice& notice) override;
+  bool CheckNotice(Notice& notice) override;
+};
 
 bool clsCMLFLFDAcsv::Prepare(Notice& notice) {
   if (TrimBlanks(Str(TradingPartner().ABN)).empty() && HasInvoiceDocument()) {
@@ -58,5 +63,9 @@ bool clsCMLFLFDAcsv::CheckNotice(Notice& notice) {
                       " greater then order Required date " + Format(*cancel, "Short Date"));
   return false;
 }
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeCMLFLFDAcsv(const Ports& ports) { return std::make_unique<clsCMLFLFDAcsv>(ports); }
 
 }  // namespace partnerkit::shipment

@@ -1,5 +1,5 @@
 // Ship notices to Kmart.
-#include "shipment/csv/csv_notice_classes.h"
+#include "shipment/csv/csv_notice.h"
 
 namespace partnerkit::shipment {
 
@@ -45,6 +45,6 @@ constexpr CsvNoticeValues kValues{
 
 }  // namespace
 
-clsKMart856csv::clsKMart856csv(const Ports& ports) : CsvNotice(kValues, ports) {}
+std::unique_ptr<Translator> MakeKMart856csv(const Ports& ports) { return std::make_unique<CsvNotice>(kValues, ports); }
 
 }  // namespace partnerkit::shipment

@@ -1,5 +1,5 @@
 // Ship notices to the MGB stores: the norm.
-#include "shipment/csv/csv_notice_classes.h"
+#include "shipment/csv/csv_notice.h"
 
 namespace partnerkit::shipment {
 
@@ -9,6 +9,6 @@ constexpr CsvNoticeValues kValues{.compile = {.className = "clsMGB856csv"}};
 
 }  // namespace
 
-clsMGB856csv::clsMGB856csv(const Ports& ports) : CsvNotice(kValues, ports) {}
+std::unique_ptr<Translator> MakeMGB856csv(const Ports& ports) { return std::make_unique<CsvNotice>(kValues, ports); }
 
 }  // namespace partnerkit::shipment

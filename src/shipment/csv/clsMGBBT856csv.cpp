@@ -1,5 +1,5 @@
 // Ship notices to MGB by the business-to-business translator.
-#include "shipment/csv/csv_notice_classes.h"
+#include "shipment/csv/csv_notice.h"
 
 namespace partnerkit::shipment {
 
@@ -31,9 +31,13 @@ constexpr CsvNoticeValues kValues{
 
 constexpr std::size_t kMostSubPacks = 20;
 
-}  // namespace
+class clsMGBBT856csv final : public CsvNotice {
+ public:
+  explicit clsMGBBT856csv(const Ports& ports) : CsvNotice(kValues, ports) {}
 
-clsMGBBT856csv::clsMGBBT856csv(const Ports& ports) : CsvNotice(kValues, ports) {}
+ private:
+  bool FillPack(Notice& notice, const Pack& pack) override;
+};
 
 // Sub packs are named with their lead pack. One with fewer of them than the last shows no more than its own.
 bool clsMGBBT856csv::FillPack(Notice& notice, const Pack& pack) {
@@ -49,5 +53,9 @@ bool clsMGBBT856csv::FillPack(Notice& notice, const Pack& pack) {
   }
   return true;
 }
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeMGBBT856csv(const Ports& ports) { return std::make_unique<clsMGBBT856csv>(ports); }
 
 }  // namespace partnerkit::shipment

@@ -1,5 +1,5 @@
 // Despatch advices of Myer drop shipments: as the notices to the MGB stores.
-#include "shipment/csv/csv_notice_classes.h"
+#include "shipment/csv/csv_notice.h"
 
 namespace partnerkit::shipment {
 
@@ -9,6 +9,8 @@ constexpr CsvNoticeValues kValues{.compile = {.className = "clsMYERDropShipDAcsv
 
 }  // namespace
 
-clsMYERDropShipDAcsv::clsMYERDropShipDAcsv(const Ports& ports) : CsvNotice(kValues, ports) {}
+std::unique_ptr<Translator> MakeMYERDropShipDAcsv(const Ports& ports) {
+  return std::make_unique<CsvNotice>(kValues, ports);
+}
 
 }  // namespace partnerkit::shipment

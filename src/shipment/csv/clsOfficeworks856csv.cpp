@@ -1,5 +1,5 @@
 // Ship notices to Officeworks.
-#include "shipment/csv/csv_notice_classes.h"
+#include "shipment/csv/csv_notice.h"
 
 namespace partnerkit::shipment {
 
@@ -39,6 +39,8 @@ constexpr CsvNoticeValues kValues{
 
 }  // namespace
 
-clsOfficeworks856csv::clsOfficeworks856csv(const Ports& ports) : CsvNotice(kValues, ports) {}
+std::unique_ptr<Translator> MakeOfficeworks856csv(const Ports& ports) {
+  return std::make_unique<CsvNotice>(kValues, ports);
+}
 
 }  // namespace partnerkit::shipment

@@ -1,5 +1,5 @@
 // Ship notices to Target.
-#include "shipment/csv/csv_notice_classes.h"
+#include "shipment/csv/csv_notice.h"
 #include "values/format.h"
 
 namespace partnerkit::shipment {
@@ -37,9 +37,14 @@ constexpr CsvNoticeValues kValues{
     .deliveryDocket = true,
 };
 
-}  // namespace
+class clsTarget856csv final : public CsvNotice {
+ public:
+  explicit clsTarget856csv(const Ports& ports) : CsvNotice(kValues, ports) {}
 
-clsTarget856csv::clsTarget856csv(const Ports& ports) : CsvNotice(kValues, ports) {}
+ private:
+  bool WriteNotice(Notice& notice) override;
+  bool FollowOn(Notice& notice) override;
+};
 
 bool clsTarget856csv::WriteNotice(Notice& notice) {
   Host().CompileTotal1 = Host().CompileTotal2 = 0;
@@ -51,5 +56,9 @@ bool clsTarget856csv::FollowOn(Notice& notice) {
   if (Str(Document().Options) == "#%TARGETCHINADHL") ProcessChinaDHL(notice);
   return true;
 }
+
+}  // namespace
+
+std::unique_ptr<Translator> MakeTarget856csv(const Ports& ports) { return std::make_unique<clsTarget856csv>(ports); }
 
 }  // namespace partnerkit::shipment

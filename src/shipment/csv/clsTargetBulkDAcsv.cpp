@@ -1,5 +1,5 @@
 // Despatch advices of Target bulk orders.
-#include "shipment/csv/csv_notice_classes.h"
+#include "shipment/csv/csv_notice.h"
 #include "shipment/csv/despatch_advice_fields.h"
 
 namespace partnerkit::shipment {
@@ -25,6 +25,8 @@ constexpr CsvNoticeValues kValues{
 
 }  // namespace
 
-clsTargetBulkDAcsv::clsTargetBulkDAcsv(const Ports& ports) : CsvNotice(kValues, ports) {}
+std::unique_ptr<Translator> MakeTargetBulkDAcsv(const Ports& ports) {
+  return std::make_unique<CsvNotice>(kValues, ports);
+}
 
 }  // namespace partnerkit::shipment

@@ -39,12 +39,12 @@ struct CsvNoticeValues {
 
 class CsvNotice : public CompileFrame {
  public:
+  // The values must outlive the object.
+  CsvNotice(const CsvNoticeValues& values, const Ports& ports);
   // Reads the map of the notice's columns, a name a line. False, with a log record, when it isn't there or is empty.
   bool OpenMapFile(const std::string& sMapFileName);
 
  protected:
-  CsvNotice(const CsvNoticeValues& values, const Ports& ports);
-
   bool Prepare(Notice& notice) override;
   bool Number(Notice& notice) override;
   bool OpenOutput(Notice& notice) override;
