@@ -47,7 +47,7 @@ class OrderLines {
   // What a listed order settles under.
   std::string Key(const std::string& number, std::string controls) const {
     std::erase(controls, '/');
-    return TheSubject().rules.settlesByControls ? number + '\0' + controls : number;
+    return TheSubject().Is("by-controls") ? number + '\0' + controls : number;
   }
   // What the line's order settles under.
   std::string Key(std::string_view line) const {
@@ -75,10 +75,11 @@ class OrderLines {
   static constexpr std::string_view kControls[] = {"INTCONTROLNO", "GRPCONTROLNO", "TRNCONTROLNO"};
 
   std::string Number(std::string_view line) const {
-    const ClassRules& rules = TheSubject().rules;
+    const Subject& subject = TheSubject();
     std::string number = Field(line, "PONUMBER");
-    if (rules.shortNumbers && number.size() <= 8) return number + " #" + Field(line, "SHIPTOLOCPARTNERNO");
-    if (rules.releases && Field(line, "POTYPECODE") == "RL") return number + " REL# " + Field(line, "POVERSIONNO");
+    if (subject.Is("short-numbers") && number.size() <= 8) return number + " #" + Field(line, "SHIPTOLOCPARTNERNO");
+    if (subject.Is("releases") && Field(line, "POTYPECODE") == "RL")
+      return number + " REL# " + Field(line, "POVERSIONNO");
     return number;
   }
 
@@ -87,7 +88,7 @@ class OrderLines {
   std::string Field(std::string_view line, std::string_view name) const {
     line = line.substr(0, line.find_first_of("\r\n"));
     const auto comma = [&] {
-      const bool quoted = TheSubject().rules.quotesProtectCommas && line.starts_with('"');
+      const bool quoted = TheSubject().Is("quoted-commas") && line.starts_with('"');
       const std::size_t close = quoted ? line.find('"', 1) : std::string_view::npos;
       return line.find(',', close == std::string_view::npos ? 0 : close);
     };

@@ -57,7 +57,7 @@ class OrderRun : private ImportRun {
     importer->Cancel();
     const std::string& after = files_.Bytes(kOrders);
     // Envelope segments stay, some of them as the whole transaction.
-    if (!TheSubject().rules.deletesEnvelopes && HasEnvelope(before)) return;
+    if (!TheSubject().Is("deletes-envelopes") && HasEnvelope(before)) return;
     const std::vector<std::string_view> old = LinesOf(before), left = LinesOf(after);
     Check(old.size() > left.size(), "Delete takes something out");
     const std::vector<std::string_view> oldOwn = Own(old, true), own = Own(left, true);
@@ -95,14 +95,14 @@ class OrderRun : private ImportRun {
   // Whether an order with this last message leaves the file unposted. A failed check is a rejection too, but begins
   // with "...".
   static bool TurnsAway(const LogRecord& last) {
-    const ClassRules& rules = TheSubject().rules;
+    const Subject& subject = TheSubject();
     if (Says(last, kRejected, "Cannot process") || Says(last, kRejected, "... Warning Purchase Order Change ") ||
         Says(last, kWarned, "... Warning Purchase Order Response. ")) {
-      return !rules.keepsTurnedAway;
+      return !subject.Is("keeps-turned-away");
     }
     return Says(last, kWarned, "... Warning Purchase Order CANCEL Request ") ||
            Says(last, kWarned, "... Warning Purchase Order Change Request Cancel Balance Of ") ||
-           (Says(last, kWarned, "... Warning Purchase Order Cancel Request ") && !rules.cancelsInFile);
+           (Says(last, kWarned, "... Warning Purchase Order Cancel Request ") && !subject.Is("cancels-in-file"));
   }
 
   static bool TakesBack(const LogRecord& last) {
@@ -143,15 +143,15 @@ class OrderRun : private ImportRun {
 
   // All transactions of one number leave together: one that failed goes with another of its number that was dealt with.
   void CheckFile(const std::string& before, const std::string& backup, const Settled& settled) {
-    const ClassRules& rules = TheSubject().rules;
+    const Subject& subject = TheSubject();
     std::string_view text = before;
     const std::string_view mark = text.starts_with("\xEF\xBB\xBF") ? text.substr(0, 3) : std::string_view();
     text.remove_prefix(mark.size());
     const std::vector<std::string_view> lines = LinesOf(text);
-    if (rules.settlesByControls && lines_.AnyAmbiguous(lines)) return;
+    if (subject.Is("by-controls") && lines_.AnyAmbiguous(lines)) return;
     std::string kept, moved = backup;
     for (const std::string_view line : lines) {
-      if (rules.dropsBlankLines && IsBlank(line)) continue;
+      if (subject.Is("drops-blank-lines") && IsBlank(line)) continue;
       const std::string key = lines_.Key(line);
       const bool stays = !lines_.IsOurs(line);
       if (settled.posted.contains(key) && !stays) {
@@ -175,9 +175,9 @@ class OrderRun : private ImportRun {
       Check(order->Status == (wanted->second.faulty ? 9 : 0), "a stored order is complete, or told to have errors");
       OrderLocnLine probe;
       probe.OrderId = order->OrderId;
-      Check(
-          TheSubject().rules.linesMayNotCount || partnerkit::Count(host_.Records(), OrderLocnLine::kByOrder, probe) > 0,
-          "a stored order has lines");
+      Check(TheSubject().Is("lines-may-not-count") ||
+                partnerkit::Count(host_.Records(), OrderLocnLine::kByOrder, probe) > 0,
+            "a stored order has lines");
     }
     Check(found.size() == stored_.size(), "the store holds all that was posted");
   }

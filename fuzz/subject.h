@@ -4,15 +4,19 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
+#include <fstream>
+#include <iterator>
 #include <memory>
 #include <nlohmann/json.hpp>
+#include <set>
+#include <sstream>
 #include <string>
 #include <string_view>
 #include <utility>
 #include <vector>
 
 #include "cli/output/record_json.h"
-#include "cli/verbs/demo.h"
+#include "cli/workspace/demo_files.h"
 #include "partnerkit/records.h"
 
 namespace partnerkit::fuzz {
@@ -23,30 +27,19 @@ inline void Check(bool holds, const char* what) {
   std::abort();
 }
 
-// How a class departs from the norm in what stays in the file.
-struct ClassRules {
-  std::string_view name;
-  bool deletesEnvelopes = false;
-  bool quotesProtectCommas = false;
-  bool settlesByControls = false;
-  bool cancelsInFile = false;  // a cancellation stays in the file
-  bool releases = false;       // a release goes by its version, too
-  bool dropsBlankLines = false;
-  bool shortNumbers = false;  // a short number goes by its ship-to, too
-  bool keepsTurnedAway = false;
-  bool linesMayNotCount = false;  // an order may be left without lines
-};
+// The words of tests/data/file_rules.txt that hold for the class.
+using ClassRules = std::set<std::string, std::less<>>;
 
-// clang-format off
-inline constexpr ClassRules kClassRules[] = {
-    {.name = "PartnerKit.clsMGB850csv", .deletesEnvelopes = true},
-    {.name = "PartnerKit.clsMYERDropShipPOcsv", .deletesEnvelopes = true},
-    {.name = "PartnerKit.clsMGBBT850csv", .quotesProtectCommas = true, .settlesByControls = true, .cancelsInFile = true},
-    {.name = "PartnerKit.clsKMart850csv", .cancelsInFile = true, .releases = true, .dropsBlankLines = true, .linesMayNotCount = true},
-    {.name = "PartnerKit.clsCMLFLFPOcsv", .shortNumbers = true, .keepsTurnedAway = true, .linesMayNotCount = true},
-    {.name = "PartnerKit.clsTargetBulkPOcsv", .keepsTurnedAway = true, .linesMayNotCount = true},
-};
-// clang-format on
+inline ClassRules ReadRules(std::string_view progId) {
+  std::ifstream table(PARTNERKIT_FILE_RULES);
+  Check(table.good(), "tests/data/file_rules.txt is there");
+  for (std::string line; std::getline(table, line);) {
+    std::istringstream words(line.substr(0, line.find('#')));
+    std::string name;
+    if (words >> name && "PartnerKit." + name == progId) return {std::istream_iterator<std::string>(words), {}};
+  }
+  return {};
+}
 
 // The program's own.
 extern const std::string_view kDefaultClass;
@@ -54,6 +47,7 @@ extern const std::string_view kDefaultClass;
 struct Subject {
   std::string progId;
   ClassRules rules;
+  bool Is(std::string_view word) const { return rules.contains(word); }
   std::string map;
   std::string orders;
   EDIDoc document;
@@ -88,8 +82,7 @@ inline Subject ReadSubject() {
   Subject subject;
   const char* const named = std::getenv("PARTNERKIT_FUZZ_CLASS");
   subject.progId = named == nullptr ? kDefaultClass : named;
-  const auto rules = std::ranges::find(kClassRules, subject.progId, &ClassRules::name);
-  if (rules != std::end(kClassRules)) subject.rules = *rules;
+  subject.rules = ReadRules(subject.progId);
   for (const cli::DemoFile& file : cli::DemoFiles()) {
     if (!file.path.ends_with(".json")) continue;
     const auto data = nlohmann::json::parse(file.text);

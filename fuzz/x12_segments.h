@@ -130,10 +130,10 @@ class X12Segments {
     return gs.starts_with("GS*") && std::ranges::count(gs.substr(0, gs.find('~')), '*') > 6;
   }
 
-  static bool IsOfLines() { return TheSubject().progId == "PartnerKit.clsGHPL850ansix12"; }
+  static bool IsOfLines() { return TheSubject().Is("whole-lines"); }
   static std::string_view Ends() {
     if (IsOfLines()) return "\r\n";
-    return TheSubject().progId == "PartnerKit.clsMGB850ansix12" ? "\r\n~'" : "\r\n~";
+    return TheSubject().Is("apostrophe-ends") ? "\r\n~'" : "\r\n~";
   }
   static bool MayBeOurs(const std::string& isa) {
     return isa.find(Str(TheSubject().document.PartnerEDIAddr)) != std::string::npos;

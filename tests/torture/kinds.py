@@ -2,6 +2,8 @@
 
 from dataclasses import dataclass, field
 
+from file_rules import rules_of
+
 # What becomes of an order.
 POSTED = "posted"        # in the store once, its lines in the backup
 FAULTY = "faulty"        # the same, but stored at Status 9, its faults to be settled there
@@ -120,9 +122,9 @@ KINDS = {
 
 def number_of(class_name, fields):
     """The number that an order is listed and stored under."""
-    number = fields["PONUMBER"]
-    if class_name == "clsCMLFLFPOcsv" and len(number) <= 8:
+    number, rules = fields["PONUMBER"], rules_of(class_name)
+    if "short-numbers" in rules and len(number) <= 8:
         return f"{number} #{fields['SHIPTOLOCPARTNERNO']}"
-    if class_name == "clsKMart850csv" and fields["POTYPECODE"] == "RL":
+    if "releases" in rules and fields["POTYPECODE"] == "RL":
         return f"{number} REL# {fields['POVERSIONNO']}"
     return number

@@ -7,6 +7,7 @@ from dataclasses import dataclass, field
 import kinds
 import verdict
 from kinds import FAULTY, KEPT, POSTED
+from file_rules import rules_of
 from order_samples import WAREHOUSE
 
 PRODUCTS = [f"93123456{number:05}" for number in range(10001, 10009)]
@@ -103,9 +104,10 @@ class Trade:
         self.order_class = order_class
         self.kinds = its_kinds or kinds.KINDS[order_class.name]
         self.cycle = 2 * len(self.kinds) + 1
-        self.drops_blank_lines = order_class.name == "clsKMart850csv"
+        rules = rules_of(order_class.name)
+        self.drops_blank_lines = "drops-blank-lines" in rules
         # So an order that a killed run has posted stays in the file: the next run turns it away as stored already.
-        self.keeps_turned_away = order_class.name in ("clsCMLFLFPOcsv", "clsTargetBulkPOcsv")
+        self.keeps_turned_away = "keeps-turned-away" in rules
         self.answers_orders = any(kind.fate == FAULTY for kind in self.kinds)
 
     def make_file(self, count=None, products=2, stores=2, *, plain=False, first_number=45000000, seed=1, options=""):

@@ -5,6 +5,7 @@ from dataclasses import dataclass
 
 import orders
 import x12_verdict
+from file_rules import rules_of
 from kinds import KEPT, PLAIN
 from x12_kinds import KINDS, NOT_LISTED, STAYS_WITH
 from x12_samples import replaced
@@ -111,14 +112,14 @@ class X12Trade(orders.Trade):
 
     def __init__(self, order_class):
         super().__init__(order_class, KINDS[order_class.name])
-        self.archives = order_class.name != "clsGHPL850ansix12"
-        self.leaves_temporary = order_class.name in ("clsTarget850ansix12", "clsGHPL850ansix12")
-        # A rewrite that ends in an order that stays puts a bare terminator behind it.
-        self.bare_ends = order_class.name in ("clsTarget850ansix12", "clsKMart850ansix12")
+        rules = rules_of(order_class.name)
+        self.archives = "no-archive" not in rules
+        self.leaves_temporary = "leaves-temporary" in rules
+        self.bare_ends = "bare-ends" in rules
         self.stays_with = STAYS_WITH.get(order_class.name)
-        lines_only = "~" not in order_class.end
+        lines_only = "whole-lines" in rules
         self.own_ends = ["\r\n", "\n"] if lines_only else ["~\r\n", "~", "~\n"]
-        if order_class.name in ("clsMGB850ansix12", "clsKMart850ansix12"):
+        if rules & {"apostrophe-ends", "cuts-apostrophes"}:
             self.own_ends.append("'\r\n")
         self.other_ends = ["\r\n\r\n", "\r"] if lines_only else ["~", "~\r\n\r\n", "\n", "~\n\n"]
 
